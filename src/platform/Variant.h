@@ -1,0 +1,90 @@
+#pragma once
+
+#include <cstdint>
+#include <string>
+#include <variant>
+#include <vector>
+
+#include "platform/ErrorInfo.h"
+
+namespace cv {
+
+namespace platform {
+class Locale;
+}
+
+// COM variant type codes.
+enum VarType : uint16_t {
+    VT_EMPTY = 0,
+    VT_NULL = 1,
+    VT_I2 = 2,
+    VT_I4 = 3,
+    VT_R4 = 4,
+    VT_R8 = 5,
+    VT_DATE = 7,
+    VT_BSTR = 8,
+    VT_BOOL = 11,
+    VT_VARIANT = 12,
+    VT_ARRAY = 0x2000,
+};
+
+// A value as the automation library carries it: empty, null, 16- and 32-bit
+// integers, single and double floats, Boolean, date (OLE automation date:
+// days since 1899-12-30), text, and one-dimensional arrays of these.
+class Variant {
+public:
+    Variant() = default;  // empty
+
+    static Variant Null();
+    static Variant I2(int16_t value);
+    static Variant I4(int32_t value);
+    static Variant R4(float value);
+    static Variant R8(double value);
+    static Variant Date(double oleDate);
+    static Variant Bool(bool value);
+    static Variant Str(std::string value);
+    // elementType is the type of every element (VT_VARIANT for mixed ones).
+    static Variant Array(uint16_t elementType, std::vector<Variant> elements,
+                         int32_t lowerBound = 0);
+
+    // The type code; arrays answer VT_ARRAY | element type.
+    uint16_t VarType() const { return vt_; }
+    bool IsEmpty() const { return vt_ == VT_EMPTY; }
+    bool IsNull() const { return vt_ == VT_NULL; }
+    bool IsArray() const { return (vt_ & VT_ARRAY) != 0; }
+
+    // Accessors for the stored value; each requires the matching type.
+    int16_t AsI2() const;
+    int32_t AsI4() const;
+    float AsR4() const;
+    double AsR8() const;  // VT_R8 and VT_DATE
+    bool AsBool() const;
+    const std::string& AsStr() const;
+    const std::vector<Variant>& Elements() const;
+    int32_t LowerBound() const;
+
+    bool operator==(const Variant& other) const = default;
+
+private:
+    struct ArrayData {
+        std::vector<Variant> elements;
+        int32_t lowerBound = 0;
+        bool operator==(const ArrayData&) const = default;
+    };
+    using Storage =
+        std::variant<std::monostate, int16_t, int32_t, float, double, bool, std::string, ArrayData>;
+
+    Variant(uint16_t vt, Storage value) : vt_(vt), value_(std::move(value)) {}
+
+    uint16_t vt_ = VT_EMPTY;
+    Storage value_;
+};
+
+// Converts source to the type vt as the automation library's VariantChangeType
+// does with flags 0: texts are read and written with the user's regional
+// settings, floats round to integers with halves to even, and a failure comes
+// back as type mismatch (13) or overflow (6) with result left empty.
+ErrorInfo ChangeType(Variant& result, const Variant& source, uint16_t vt,
+                     const platform::Locale& locale);
+
+}  // namespace cv
