@@ -1,0 +1,154 @@
+#include "platform/posix/IniDocument.h"
+
+#include <gtest/gtest.h>
+
+#include <string>
+
+namespace cv::posix {
+namespace {
+
+using namespace std::string_literals;
+
+std::string Edited(const std::string& text, auto edit) {
+    IniDocument document = IniDocument::Parse(text);
+    edit(document);
+    return document.Serialise();
+}
+
+TEST(IniDocument, RewritesEveryByteItDidNotChange) {
+    const std::string texts[] = {
+        "",
+        "[A]\r\nx=1\r\n",
+        "[A]\nx=1\n; note\n\n[B]\ny = 2",
+        "\xEF\xBB\xBF[A]\r\nx=1\nmixed\r\n\r\n",
+        "junk\x01\xFF\0line\r\r\n[unclosed\n=\n[]\n"s,
+        "preamble=1\n  [ Loop 1 ] trailing\n\tRate = 5 \n",
+    };
+    for (const std::string& text : texts) {
+        EXPECT_EQ(IniDocument::Parse(text).Serialise(), text);
+    }
+}
+
+TEST(IniDocument, ReadsWhatWindowsFilesHold) {
+    const auto document = IniDocument::Parse(
+        "top=0\r\n"
+        "[ Loop 1 ] ; title\r\n"
+        "  Rate  =  5  \r\n"
+        "quoted='  padded  '\r\n"
+        "double=\"x\"\r\n"
+        "half='x\r\n"
+        "inline=1 ; not a comment\r\n"
+        ";hidden=1\r\n"
+        "no equals sign\r\n"
+        "[Broken\r\n"
+        "after=broken\r\n"
+        "empty=\r\n"
+        "[a]b]\r\n"
+        "c=3\r\n");
+    EXPECT_EQ(document.Value("loop 1", "RATE"), "5");
+    EXPECT_EQ(document.Value(" Loop 1 ", " Rate "), "5");
+    EXPECT_EQ(document.Value("Loop 1", "quoted"), "  padded  ");
+    EXPECT_EQ(document.Value("Loop 1", "double"), "x");
+    EXPECT_EQ(document.Value("Loop 1", "half"), "'x");
+    EXPECT_EQ(document.Value("Loop 1", "inline"), "1 ; not a comment");
+    EXPECT_EQ(document.Value("Loop 1", ";hidden"), std::nullopt);
+    EXPECT_EQ(document.Value("Loop 1", "no equals sign"), std::nullopt);
+    EXPECT_EQ(document.Value("Loop 1", "[Broken"), std::nullopt);
+    EXPECT_EQ(document.Value("Loop 1", "after"), "broken");
+    EXPECT_EQ(document.Value("Loop 1", "empty"), "");
+    EXPECT_EQ(document.Value("a]b", "c"), "3");
+    EXPECT_EQ(document.Value("", "top"), std::nullopt);
+    EXPECT_EQ(document.Value("Broken", "after"), std::nullopt);
+}
+
+TEST(IniDocument, DuplicateSectionsAndKeysReadAndWriteTheFirstEntry) {
+    const std::string text = "[A]\nx=1\nx=2\n\n[B]\nz=9\n\n[a]\nx=3\ny=4\n";
+    auto document = IniDocument::Parse(text);
+    EXPECT_EQ(document.Value("A", "x"), "1");
+    EXPECT_EQ(document.Value("A", "y"), "4");
+
+    EXPECT_EQ(Edited(text, [](IniDocument& d) { d.SetValue("A", "x", "5"); }),
+              "[A]\nx=5\nx=2\n\n[B]\nz=9\n\n[a]\nx=3\ny=4\n");
+    EXPECT_EQ(Edited(text, [](IniDocument& d) { d.SetValue("A", "y", "5"); }),
+              "[A]\nx=1\nx=2\n\n[B]\nz=9\n\n[a]\nx=3\ny=5\n");
+    EXPECT_EQ(Edited(text, [](IniDocument& d) { d.SetValue("A", "w", "5"); }),
+              "[A]\nx=1\nx=2\nw=5\n\n[B]\nz=9\n\n[a]\nx=3\ny=4\n");
+    EXPECT_EQ(Edited(text, [](IniDocument& d) { EXPECT_TRUE(d.EraseKey("A", "X")); }),
+              "[A]\n\n[B]\nz=9\n\n[a]\ny=4\n");
+    EXPECT_EQ(Edited(text, [](IniDocument& d) { EXPECT_TRUE(d.EraseSection("a")); }),
+              "[B]\nz=9\n\n");
+}
+
+TEST(IniDocument, ReplacesAValueInPlace) {
+    EXPECT_EQ(Edited("[S]\r\n  Rate = 5 \r\nb=1\r\n",
+                     [](IniDocument& d) { EXPECT_TRUE(d.SetValue("s", "RATE", "10")); }),
+              "[S]\r\n  Rate = 10\r\nb=1\r\n");
+    EXPECT_EQ(Edited("[S]\nx=\n", [](IniDocument& d) { d.SetValue("S", "x", "1"); }), "[S]\nx=1\n");
+    auto document = IniDocument::Parse("[S]\nx=1\n");
+    EXPECT_FALSE(document.SetValue("S", "x", "1"));
+    EXPECT_FALSE(document.EraseKey("S", "y"));
+    EXPECT_FALSE(document.EraseKey("T", "x"));
+    EXPECT_FALSE(document.EraseSection("T"));
+}
+
+TEST(IniDocument, PlacesNewKeysAndSections) {
+    EXPECT_EQ(Edited("", [](IniDocument& d) { d.SetValue(" New ", " key ", " v "); }),
+              "[New]\r\nkey= v \r\n");
+    EXPECT_EQ(
+        Edited("[A]\nx=1\n; about B\n\n\n[B]\n", [](IniDocument& d) { d.SetValue("A", "y", "2"); }),
+        "[A]\nx=1\n; about B\ny=2\n\n\n[B]\n");
+    EXPECT_EQ(Edited("[A]\n\n[B]\n", [](IniDocument& d) { d.SetValue("A", "y", "2"); }),
+              "[A]\ny=2\n\n[B]\n");
+    EXPECT_EQ(Edited("[A]\nx=1", [](IniDocument& d) { d.SetValue("A", "y", "2"); }),
+              "[A]\nx=1\ny=2\n");
+    EXPECT_EQ(Edited("[A]\nx=1", [](IniDocument& d) { d.SetValue("B", "y", "2"); }),
+              "[A]\nx=1\n\n[B]\ny=2\n");
+    EXPECT_EQ(Edited("[A]\r\nx=1\r\n\r\n", [](IniDocument& d) { d.SetValue("B", "y", "2"); }),
+              "[A]\r\nx=1\r\n\r\n[B]\r\ny=2\r\n");
+    EXPECT_EQ(Edited("; only a comment", [](IniDocument& d) { d.SetValue("B", "y", "2"); }),
+              "; only a comment\r\n\r\n[B]\r\ny=2\r\n");
+}
+
+TEST(IniDocument, ErasingLeavesTheRestIntact) {
+    EXPECT_EQ(
+        Edited("[A]\r\nx=1\r\n\r\n[B]\r\ny=2\r\n", [](IniDocument& d) { d.EraseKey("A", "x"); }),
+        "[A]\r\n\r\n[B]\r\ny=2\r\n");
+    EXPECT_EQ(Edited("[A]\r\nx=1\r\n\r\n[B]\r\ny=2\r\n; tail\r\n[C]\r\nz=3",
+                     [](IniDocument& d) { d.EraseSection("B"); }),
+              "[A]\r\nx=1\r\n\r\n[C]\r\nz=3");
+    auto document = IniDocument::Parse("[A]\nx=1\n[B]\ny=2\n[C]\nz=3\n");
+    document.EraseSection("A");
+    document.SetValue("C", "w", "4");
+    EXPECT_EQ(document.Value("B", "y"), "2");
+    EXPECT_EQ(document.Value("C", "z"), "3");
+    EXPECT_EQ(document.Value("C", "w"), "4");
+    EXPECT_EQ(document.Serialise(), "[B]\ny=2\n[C]\nz=3\nw=4\n");
+}
+
+TEST(IniDocument, RefusesNamesThatWouldReadBackAsSomethingElse) {
+    EXPECT_TRUE(IniDocument::IsSectionName("a]b [c"));
+    EXPECT_FALSE(IniDocument::IsSectionName("a\nb"));
+    EXPECT_TRUE(IniDocument::IsKeyName("Rate 1"));
+    EXPECT_TRUE(IniDocument::IsKeyName(""));
+    for (const char* key : {"a=b", "a\rb", " ;x", "[x]", "a\n"}) {
+        EXPECT_FALSE(IniDocument::IsKeyName(key)) << key;
+    }
+    EXPECT_TRUE(IniDocument::IsValueText("a=b ; 'c'"));
+    EXPECT_FALSE(IniDocument::IsValueText("a\r\n[B]\r\nx=1"));
+}
+
+TEST(IniDocument, CopesWithHugeAndOddInput) {
+    std::string text = "[A]\nbig=" + std::string(10'000'000, 'v') + "\nx=1\n[B]\0\n"s;
+    for (int i = 0; i < 256; ++i) {
+        text += static_cast<char>(i);
+    }
+    auto document = IniDocument::Parse(text);
+    EXPECT_EQ(document.Value("A", "big")->size(), 10'000'000u);
+    EXPECT_EQ(document.Value("A", "x"), "1");
+    document.SetValue("A", "x", std::string(300, 'w'));
+    EXPECT_EQ(document.Value("A", "x"), std::string(300, 'w'));
+    EXPECT_EQ(document.Value("A", "big")->size(), 10'000'000u);
+}
+
+}  // namespace
+}  // namespace cv::posix
