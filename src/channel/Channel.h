@@ -1,0 +1,198 @@
+#pragma once
+
+#include <cstdint>
+#include <string>
+
+#include "platform/ErrorInfo.h"
+#include "platform/Platform.h"
+#include "platform/Variant.h"
+
+namespace cv {
+
+class TunFile;
+
+// The three ranges a channel keeps; their names appear in messages.
+enum class RangeType : int32_t { Engineering = 0, Instrument = 1, Display = 2 };
+
+// Communication-type codes; 3, 5 and 7 have only generic handling.
+namespace ComTypeCode {
+inline constexpr int32_t Dde = 0;
+inline constexpr int32_t Opc = 4;
+inline constexpr int32_t OpcHda = 8;
+}  // namespace ComTypeCode
+
+// Communications state of a channel.
+namespace OnlineState {
+inline constexpr int32_t Offline = 0;
+inline constexpr int32_t GoingOnline = 1;
+inline constexpr int32_t Online = 2;
+}  // namespace OnlineState
+
+// One data point reached over OPC or DDE: its ranges and the conversion from
+// the raw (instrument) value to the engineering value, its display
+// attributes, its address, the last value received with its quality, and the
+// plain-words diagnosis of a failure.
+class Channel {
+  public:
+    explicit Channel(Platform& platform);
+    Channel(const Channel&) = delete;
+    Channel& operator=(const Channel&) = delete;
+
+    // Ranges. Equal (or non-finite) limits are stored as 0 and 100.
+    double EngMin() const { return mdEngMin; }
+    double EngMax() const { return mdEngMax; }
+    double InstMin() const { return mdInstMin; }
+    double InstMax() const { return mdInstMax; }
+    double DisplayMin() const { return mdDisplayMin; }
+    double DisplayMax() const { return mdDisplayMax; }
+    void SetRange(RangeType eRange, double dMin, double dMax);
+    bool ValidateRange(RangeType eRange, double dMin, double dMax, std::string& sMessage) const;
+    // lWhich: 0 minimum, 1 maximum.
+    double GetRangeValue(RangeType eRange, int32_t lWhich) const;
+    ErrorInfo SpanValue(RangeType eRange, double& dSpan) const;
+    void CopyRangeValuesFrom(const Channel& cSource);
+    void CopyEngRangeToInstRange();
+    ErrorInfo SetDefaultDisplaySpan(bool bUseCurrent, float sngLow, float sngHigh);
+
+    // Scaling between the instrument and the engineering range.
+    double ScaleFactor() const { return mdScaleFactor; }
+    double ScaleOffset() const { return mdScaleOffset; }
+    bool NeedsScaling(TunFile& cTunFile);
+    double ScalePriorToOutput(double dValue) const;
+    ErrorInfo ConvertToPercent(double dValue, double& dPercent) const;
+    ErrorInfo ConvertFromPercent(double dPercent, double& dValue) const;
+    // May ask the uncertain-value or the conversion question.
+    double CurrentValue();
+    std::string FormatCurrentValue();
+
+    // Display attributes.
+    int32_t DecimalPlaces() const { return miDecimalPlaces; }
+    void SetDecimalPlaces(int32_t lPlaces);
+    bool ValidateDecimalPlaces(int32_t lPlaces, std::string& sMessage) const;
+    void DefaultDecPt();
+    std::string FormatDecPt(double dValue) const;
+    const std::string& Description() const { return msDescription; }
+    void SetDescription(const std::string& sText) { msDescription = sText; }
+    const std::string& EngUnits() const { return msEngUnits; }
+    void SetEngUnits(const std::string& sText) { msEngUnits = sText; }
+    std::string EngUnitsBrackets() const;
+    std::string LineStyle() const;
+    void SetLineStyle(const std::string& sStyle);
+    int32_t LineWidth() const { return miLineWidth; }
+    void SetLineWidth(int32_t lWidth);
+    bool ValidateLineWidth(int32_t lWidth, std::string& sMessage) const;
+    int32_t LineColor() const { return mlLineColor; }
+    void SetLineColor(int32_t lColor) { mlLineColor = lColor; }
+    bool DisplayOnGraph() const { return mbDisplayOnGraph; }
+    void SetDisplayOnGraph(bool bShow) { mbDisplayOnGraph = bShow; }
+    int32_t Number() const { return miNumber; }
+    void SetNumber(int32_t lNumber) { miNumber = lNumber; }
+
+    // Address.
+    const std::string& ItemName() const { return msItemName; }
+    void SetItemName(const std::string& sName) { msItemName = sName; }
+    const std::string& TopicName() const { return msTopicName; }
+    void SetTopicName(const std::string& sName) { msTopicName = sName; }
+    const std::string& OpcAccessPath() const { return msTopicName; }
+    void SetOpcAccessPath(const std::string& sPath) { msTopicName = sPath; }
+    const std::string& DdeApplication() const { return msDdeApplication; }
+    std::string DdeAppTopic() const;
+    void SetDdeAppTopic(const std::string& sAppTopic);
+    const std::string& OpcComputer() const { return msOpcComputer; }
+    void SetOpcComputer(const std::string& sComputer) { msOpcComputer = sComputer; }
+    const std::string& OpcServerID() const { return msOpcServerID; }
+    void SetOpcServerID(const std::string& sServerID) { msOpcServerID = sServerID; }
+    // "\\Node\Server", or the server ID alone for this computer.
+    std::string OpcNodeAndServer() const;
+    void SetOpcNodeAndServer(const std::string& sNodeAndServer);
+
+    // Communications.
+    int32_t ComType() const { return miComType; }
+    void SetComType(int32_t lComType) { miComType = lComType; }
+    void CheckComType(int32_t) const {}
+    int32_t SpecificChannelType() const { return miSpecificChannelType; }
+    void SetSpecificChannelType(int32_t lType) { miSpecificChannelType = lType; }
+    bool ExpectANumber() const { return mbExpectANumber; }
+    void SetExpectANumber(bool bExpect) { mbExpectANumber = bExpect; }
+    void SetDisplayVarType(int16_t iVarType) { miDisplayVarType = iVarType; }
+    bool IsOnline() const { return miState == OnlineState::Online; }
+    int32_t Online(bool bTimedOut);
+    void GoOffline();
+    // Returns the stored error text and clears it.
+    std::string ErrorStr();
+    int32_t SendResult() const { return miSendResult; }
+    void SetSendResult(int32_t lResult) { miSendResult = lResult; }
+    // The value as received: 0 while not online; may ask the uncertain-value
+    // question once per channel.
+    Variant RawValue();
+
+    // OPC members used by the OPC client.
+    void OpcSetRawValue(const Variant& vValue, int32_t lQuality, double dTimeStamp,
+                        bool bSingleShot);
+    void OpcDataChange(const std::string& sText);
+    int32_t OpcServerHandle() const { return mlOpcServerHandle; }
+    void SetOpcServerHandle(int32_t lHandle) { mlOpcServerHandle = lHandle; }
+    int32_t OpcGroupNumber() const;
+    bool OpcIsActive() const;
+    int16_t OpcRawValueVarType() const;
+    double OpcTimeStamp() const;
+
+    // The plain-words diagnosis of sOverride, or of currentError when
+    // sOverride is empty. A DDE time-out sets lButtons to Yes/No and asks
+    // sQuestion.
+    std::string GetErrorString(const std::string& sOverride, int32_t& lButtons,
+                               std::string& sQuestion, const ErrorInfo& currentError);
+
+  private:
+    void CalcScaleFactors();
+    void UpdateScalingFlags(TunFile& cTunFile);
+    ErrorInfo ScaledRawValue(const Variant& vRaw, double& dValue) const;
+    void ProveNumber();
+    void AskUncertainWarning();
+    std::string QualityText(int32_t lQuality) const;
+    std::string VariantText(const Variant& vValue) const;
+    std::string DiagnoseError(const ErrorInfo& currentError, int32_t& lButtons,
+                              std::string& sQuestion);
+    std::string DiagnoseOpcError(const ErrorInfo& currentError) const;
+    std::string ObjectCreationText() const;
+    std::string CommsFailureText() const;
+
+    Platform& mPlatform;
+
+    int32_t miNumber = 0;
+    double mdEngMin = 0;
+    double mdEngMax = 100;
+    double mdInstMin = 0;
+    double mdInstMax = 100;
+    std::string msDescription;
+    std::string msEngUnits;
+    int32_t miDecimalPlaces = 2;
+    double mdDisplayMin = 0;
+    double mdDisplayMax = 100;
+    int32_t miLineStyle = 0;
+    int32_t miLineWidth = 2;
+    int32_t mlLineColor = 0x00FF00;
+    bool mbDisplayOnGraph = true;
+    int32_t miComType = ComTypeCode::Dde;
+    int32_t miSpecificChannelType = 0;
+    bool mbExpectANumber = true;
+    double mdScaleFactor = 1;
+    double mdScaleOffset = 0;
+    bool mbNeedsScaling = false;
+    bool mbScalePriorToOutput = false;
+    std::string msErrorStr;
+    int32_t miState = OnlineState::Offline;
+    int32_t miSendResult = 0;
+    std::string msItemName;
+    std::string msTopicName;
+    int16_t miDisplayVarType = 0;
+    std::string msDdeApplication;
+    std::string msOpcComputer;
+    std::string msOpcServerID;
+    int32_t mlOpcServerHandle = 0;
+    Variant mvRawValue = Variant::Null();
+    double mdTimeStamp = 0;
+    int32_t mlQuality = 0;
+};
+
+}  // namespace cv
