@@ -1,0 +1,99 @@
+#pragma once
+
+#include <cstdint>
+#include <string>
+#include <string_view>
+
+#include "platform/posix/FileStamp.h"
+#include "platform/posix/UniqueFd.h"
+
+namespace cv::posix {
+
+enum class ReadStatus {
+    Read,        // the whole file is in Text
+    Missing,     // no file (or no folder) at the path
+    Unreadable,  // it exists but cannot be read: no permission, a folder, too large, I/O error
+};
+
+// The mode of a file this class creates. An existing file always keeps its mode.
+enum class NewFileMode {
+    OwnerOnly,     // 0600: settings are the user's own
+    UmaskDefault,  // 0666 less the process umask, as ordinary programs create files
+};
+
+struct FileRead {
+    ReadStatus Status = ReadStatus::Missing;
+    std::string Text;
+    FileStamp Stamp;  // of the version read; missing unless Status is Read
+    int Error = 0;    // errno behind Unreadable
+};
+
+// One file that is only ever replaced whole, never torn, and whose
+// read-modify-write cycles exclude each other across processes.
+//
+// Replacing: the new text goes to a temporary file in the same folder
+// (".<name>.cv-tmp"), is flushed to disk, and is renamed over the file; the
+// folder is flushed too. A reader sees the old or the new text, never a mix,
+// and a crash at any moment leaves one of the two. A symbolic link is
+// followed: its target is replaced and the link stays.
+//
+// Locking: an exclusive flock on the file itself, so no lock file is left
+// beside it. Because a replace puts a new inode at the path, Lock re-checks
+// after acquiring that the locked inode is still the one at the path and
+// tries again otherwise; Replace locks the new inode before renaming it into
+// place, so the holder keeps the lock without a gap. A missing file is
+// created empty to be locked, and removed again on Unlock when nothing was
+// written. Temporary files exist only while the lock is held, so a stale one
+// left by a crash is simply overwritten by the next writer. Locks are per
+// object: two objects of one process on the same file exclude each other too.
+//
+// Every result is an errno value, 0 for success; nothing throws.
+class AtomicFile {
+  public:
+    // Files larger than this are not read (Unreadable, EFBIG).
+    static constexpr int64_t kMaxBytes = int64_t{64} << 20;
+    // How long Lock waits for another holder before giving up with ETIMEDOUT.
+    static constexpr int kLockWaitMs = 10000;
+
+    explicit AtomicFile(std::string sPath, NewFileMode eNewMode = NewFileMode::OwnerOnly);
+    ~AtomicFile();
+    AtomicFile(const AtomicFile&) = delete;
+    AtomicFile& operator=(const AtomicFile&) = delete;
+
+    const std::string& Path() const { return msPath; }
+
+    // The whole file. Needs no lock: writers only ever rename whole files in.
+    // While this object holds the lock, reads the locked version.
+    FileRead Read() const;
+    // The current version's stamp, without reading (one stat).
+    FileStamp Stamp() const;
+
+    int Lock();
+    void Unlock();
+    bool Locked() const { return mcLock.Valid(); }
+
+    // Puts sText in place atomically. Takes the lock for the call when not
+    // held. Refuses (EACCES) a file the user has made read-only.
+    int Replace(std::string_view sText);
+    // Keeps a copy of the current file as "<path>.damaged-YYYYMMDD-HHMMSS"
+    // (with "-2", "-3", ... when taken), so that a following Replace cannot
+    // lose it; sAsidePath receives the copy's path.
+    int SetAside(std::string& sAsidePath);
+
+    // Creates sFolder and its missing parents with mode 0700.
+    static int MakeFolders(const std::string& sFolder);
+
+  private:
+    int LockTarget(const std::string& sTarget);
+    int OpenForLock(const std::string& sTarget, UniqueFd& cFd);
+    int WriteTemporary(std::string_view sText, UniqueFd& cTemp, std::string& sTempPath) const;
+    int CopyTo(const std::string& sText, const std::string& sAsidePath) const;
+
+    std::string msPath;
+    NewFileMode meNewMode;
+    UniqueFd mcLock;
+    std::string msLockedTarget;
+    bool mbCreatedEmpty = false;
+};
+
+}  // namespace cv::posix
