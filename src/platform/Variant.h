@@ -32,7 +32,7 @@ enum VarType : uint16_t {
 // integers, single and double floats, Boolean, date (OLE automation date:
 // days since 1899-12-30), text, and one-dimensional arrays of these.
 class Variant {
-public:
+  public:
     Variant() = default;  // empty
 
     static Variant Null();
@@ -53,7 +53,9 @@ public:
     bool IsNull() const { return vt_ == VT_NULL; }
     bool IsArray() const { return (vt_ & VT_ARRAY) != 0; }
 
-    // Accessors for the stored value; each requires the matching type.
+    // Accessors for the stored value. Each answers for its own type only
+    // (AsR8 also for dates); asked of another type it gives 0, false or an
+    // empty text or list.
     int16_t AsI2() const;
     int32_t AsI4() const;
     float AsR4() const;
@@ -65,7 +67,7 @@ public:
 
     bool operator==(const Variant& other) const = default;
 
-private:
+  private:
     struct ArrayData {
         std::vector<Variant> elements;
         int32_t lowerBound = 0;
@@ -84,7 +86,21 @@ private:
 // does with flags 0: texts are read and written with the user's regional
 // settings, floats round to integers with halves to even, and a failure comes
 // back as type mismatch (13) or overflow (6) with result left empty.
+// - Anything but null becomes empty; anything becomes null.
+// - Empty gives 0, False, the date 0 or an empty text; null gives only null.
+// - Booleans are -1 and 0 as numbers and as text ("-1", "0"); text gives a
+//   Boolean from "True"/"False" in any case or from a number (non-zero is
+//   True).
+// - Numbers as text: integers plainly, R4 with 7 and R8 with 15 significant
+//   digits, the regional decimal separator, 1E+20 and 1E-05 forms for large
+//   and small numbers. Dates as text: see DateText.h.
+// - Arrays convert only to their own type; types this value does not carry
+//   (currency, decimal, objects, unsigned) are a type mismatch too.
 ErrorInfo ChangeType(Variant& result, const Variant& source, uint16_t vt,
                      const platform::Locale& locale);
+
+// The value's text as ChangeType to VT_BSTR gives it; empty when it has
+// none (null, arrays).
+std::string TextOf(const Variant& value, const platform::Locale& locale);
 
 }  // namespace cv
