@@ -1,0 +1,214 @@
+#include "stores/IniFile.h"
+
+#include <gtest/gtest.h>
+#include <sys/wait.h>
+#include <unistd.h>
+
+#include <climits>
+#include <filesystem>
+#include <fstream>
+#include <sstream>
+
+#include "platform/posix/FileProfiles.h"
+
+namespace cv {
+namespace {
+
+using namespace std::string_literals;
+namespace fs = std::filesystem;
+
+class IniFileTest : public ::testing::Test {
+  protected:
+    IniFileTest() {
+        std::string pattern = (fs::temp_directory_path() / "h5-inifile-XXXXXX").string();
+        folder_ = ::mkdtemp(pattern.data());
+        ini_.SetFileName(Path());
+    }
+    ~IniFileTest() override { fs::remove_all(folder_); }
+
+    std::string Path() const { return folder_ + "/Unit7.tun"; }
+    std::string Config() const { return folder_ + "/config"; }
+
+    std::string Slurp() const {
+        std::ifstream file(Path(), std::ios::binary);
+        std::ostringstream text;
+        text << file.rdbuf();
+        return text.str();
+    }
+    void Put(const std::string& sText) { std::ofstream(Path(), std::ios::binary) << sText; }
+
+    std::string folder_;
+    posix::FileProfiles profiles_{Config()};
+    IniFile ini_{profiles_};
+};
+
+TEST_F(IniFileTest, ReadLongTakesTheLeadingNumberAndClampsOnlyWithARange) {
+    Put("[L]\nhalf2=2.5\nhalf3= 3.5\nletters=12abc\nempty=\nbig=50\nlow=-3\nhuge=9e12\n");
+    EXPECT_EQ(ini_.ReadLong("L", "half2", 7, 0, 0), 2);
+    EXPECT_EQ(ini_.ReadLong("L", "half3", 7, 0, 0), 4);
+    EXPECT_EQ(ini_.ReadLong("L", "letters", 7, 0, 0), 12);
+    EXPECT_EQ(ini_.ReadLong("L", "empty", 7, 0, 0), 0);
+    EXPECT_EQ(ini_.ReadLong("L", "missing", -7, 0, 0), -7);
+    EXPECT_EQ(ini_.ReadLong("L", "missing", 99, 1, 10), 10);
+    EXPECT_EQ(ini_.ReadLong("L", "big", 0, 1, 10), 10);
+    EXPECT_EQ(ini_.ReadLong("L", "low", 0, 1, 10), 1);
+    EXPECT_EQ(ini_.ReadLong("L", "low", 0, 0, 0), -3);
+    EXPECT_EQ(ini_.ReadLong("L", "huge", 0, 0, 0), INT32_MAX);
+    EXPECT_EQ(ini_.ReadLong("L", "huge", 0, 1, 10), 10);
+
+    ini_.WriteLong("L", "written", -42);
+    EXPECT_EQ(ini_.ReadString("L", "written", ""), "-42");
+}
+
+TEST_F(IniFileTest, BooleansAreOneOrZeroAndReadAsLongs) {
+    Put("[B]\none=1\nminus=-1\nzero=0\ntwo=2\nword=True\n");
+    EXPECT_TRUE(ini_.ReadBoolean("B", "one", false));
+    EXPECT_TRUE(ini_.ReadBoolean("B", "minus", false));
+    EXPECT_FALSE(ini_.ReadBoolean("B", "zero", true));
+    EXPECT_TRUE(ini_.ReadBoolean("B", "two", true));
+    EXPECT_FALSE(ini_.ReadBoolean("B", "two", false));
+    EXPECT_FALSE(ini_.ReadBoolean("B", "word", true)) << "no number reads as 0";
+    EXPECT_TRUE(ini_.ReadBoolean("B", "missing", true));
+    EXPECT_FALSE(ini_.ReadBoolean("B", "missing", false));
+
+    ini_.WriteBoolean("B", "one", true);
+    ini_.WriteBoolean("B", "zero", false);
+    ini_.WriteBoolean("B", "minus", true);
+    EXPECT_EQ(Slurp(), "[B]\none=1\nminus=1\nzero=0\ntwo=2\nword=True\n");
+}
+
+TEST_F(IniFileTest, DoublesUseInvariantText) {
+    ini_.WriteDouble("D", "hundred", 100);
+    ini_.WriteDouble("D", "half", 0.5);
+    ini_.WriteDouble("D", "third", 1.0 / 3);
+    EXPECT_EQ(Slurp(), "[D]\r\nhundred=100\r\nhalf=.5\r\nthird=.333333333333333\r\n");
+    EXPECT_EQ(ini_.ReadDouble("D", "half", 9), 0.5);
+    ini_.WriteString("D", "suffix", "12.5 degC");
+    ini_.WriteString("D", "letters", "abc");
+    EXPECT_EQ(ini_.ReadDouble("D", "suffix", 9), 12.5);
+    EXPECT_EQ(ini_.ReadDouble("D", "letters", 9), 0);
+    EXPECT_EQ(ini_.ReadDouble("D", "missing", -0.25), -0.25);
+}
+
+TEST_F(IniFileTest, StringsKeepQuotedBlanksAndAreCutTo254Bytes) {
+    ini_.WriteString("S", "padded", "  two blanks  ", true);
+    ini_.WriteString("S", "bare", "  two blanks  ");
+    ini_.WriteString("S", "long", std::string(300, 'z'));
+    EXPECT_EQ(ini_.ReadString("S", "padded", ""), "  two blanks  ");
+    EXPECT_EQ(ini_.ReadString("S", "bare", ""), "two blanks");
+    EXPECT_EQ(ini_.ReadString("S", "long", ""), std::string(254, 'z'));
+    EXPECT_EQ(ini_.ReadString("s", "LONG", "").size(), 254u);
+    EXPECT_EQ(ini_.ReadString("S", "missing", "fallback"), "fallback");
+
+    Put("[S]\nnul=ab\0cd\n"s);
+    EXPECT_EQ(ini_.ReadString("S", "nul", ""), "ab");
+}
+
+TEST_F(IniFileTest, EraseSectionAndEraseItem) {
+    ini_.WriteString("Channel1", "a", "1");
+    ini_.WriteString("Channel1", "b", "2");
+    ini_.WriteString("Channel2", "a", "3");
+    ini_.EraseItem("Channel2", "A");
+    EXPECT_EQ(ini_.ReadString("Channel2", "a", "gone"), "gone");
+    ini_.EraseSection("CHANNEL1");
+    EXPECT_EQ(ini_.ReadString("Channel1", "a", "gone"), "gone");
+    EXPECT_EQ(ini_.ReadString("Channel1", "b", "gone"), "gone");
+    EXPECT_EQ(Slurp(), "[Channel2]\r\n");
+}
+
+TEST_F(IniFileTest, ScramblesWithTheKeyedNibbleAlphabet) {
+    EXPECT_EQ(ini_.Encrypt("3"), "qt") << "'3' xor 'r' is 0x41";
+    EXPECT_EQ(ini_.Decrypt("qt"), "3");
+    EXPECT_EQ(ini_.Decrypt("QT"), "3");
+    EXPECT_EQ(ini_.Decrypt("qtx"), "3") << "a last unpaired letter is ignored";
+    const std::string all = "\0\x01 Az~\x7F\x80\xFF"s + std::string(20, 'k');
+    EXPECT_EQ(ini_.Decrypt(ini_.Encrypt(all)), all);
+    EXPECT_EQ(ini_.Encrypt(all).size(), 2 * all.size());
+
+    ini_.SetKey("");
+    EXPECT_EQ(ini_.Encrypt("A"), "qt");
+    EXPECT_EQ(ini_.Decrypt(ini_.Encrypt(all)), all);
+    EXPECT_EQ(ini_.Decrypt("a?"), std::string(1, '\0')) << "other characters count as 0";
+}
+
+TEST_F(IniFileTest, EncryptedFilesHoldOnlyLettersAndReadBackPlain) {
+    ini_.SetEncryptedFile(true);
+    ini_.WriteString("Loop 1", "Gain", "1.5");
+    ini_.WriteLong("Loop 1", "Mode", -2);
+    ini_.WriteBoolean("Loop 1", "Auto", true);
+    EXPECT_EQ(ini_.ReadString("Loop 1", "Gain", ""), "1.5");
+    EXPECT_EQ(ini_.ReadLong("Loop 1", "Mode", 0, 0, 0), -2);
+    EXPECT_TRUE(ini_.ReadBoolean("Loop 1", "Auto", false));
+    EXPECT_EQ(ini_.ReadString("Loop 1", "missing", "plain default"), "plain default");
+    EXPECT_EQ(Slurp().find_first_not_of("cdefghipqrstuvwx[]=\r\n"), std::string::npos) << Slurp();
+
+    ini_.EraseItem("Loop 1", "Gain");
+    EXPECT_EQ(ini_.ReadString("Loop 1", "Gain", "gone"), "gone");
+    ini_.EraseSection("Loop 1");
+    EXPECT_EQ(ini_.ReadLong("Loop 1", "Mode", 5, 0, 0), 5);
+
+    ini_.SetEncryptedFile(false);
+    ini_.WriteString("S", "long", std::string(300, 'z'));
+    ini_.SetEncryptedFile(true);
+    EXPECT_EQ(ini_.ReadString("S", "missing", std::string(300, 'y')), std::string(127, 'y'));
+}
+
+TEST_F(IniFileTest, EveryWriteIsSeenAtOnceByOtherObjectsAndPrograms) {
+    IniFile second(profiles_);
+    second.SetFileName(Path());
+    posix::FileProfiles otherProgram(Config());
+    IniFile third(otherProgram);
+    third.SetFileName(Path());
+
+    ini_.WriteLong("S", "n", 1);
+    EXPECT_EQ(second.ReadLong("S", "n", 0, 0, 0), 1);
+    EXPECT_EQ(third.ReadLong("S", "n", 0, 0, 0), 1);
+    third.WriteLong("S", "n", 2);
+    EXPECT_EQ(ini_.ReadLong("S", "n", 0, 0, 0), 2);
+
+    const pid_t child = ::fork();
+    if (child == 0) {
+        posix::FileProfiles childProfiles(Config());
+        IniFile childIni(childProfiles);
+        childIni.SetFileName(Path());
+        childIni.WriteLong("S", "n", 3);
+        ::_exit(0);
+    }
+    int status = -1;
+    ::waitpid(child, &status, 0);
+    ASSERT_EQ(status, 0);
+    EXPECT_EQ(ini_.ReadLong("S", "n", 0, 0, 0), 3);
+}
+
+TEST_F(IniFileTest, BatchSavesTheWholeDocumentOnce) {
+    posix::FileProfiles otherProgram(Config());
+    IniFile other(otherProgram);
+    other.SetFileName(Path());
+    {
+        IniFile::Batch batch(ini_);
+        for (int channel = 1; channel <= 3; ++channel) {
+            ini_.WriteLong("Channel" + std::to_string(channel), "Number", channel);
+        }
+        EXPECT_EQ(ini_.ReadLong("Channel2", "Number", 0, 0, 0), 2);
+        EXPECT_EQ(other.ReadLong("Channel2", "Number", 0, 0, 0), 0);
+        EXPECT_TRUE(batch.End());
+        EXPECT_FALSE(batch.End());
+    }
+    EXPECT_EQ(other.ReadLong("Channel3", "Number", 0, 0, 0), 3);
+    {
+        IniFile::Batch batch(ini_);
+        ini_.WriteLong("Channel1", "Number", 10);
+    }
+    EXPECT_EQ(other.ReadLong("Channel1", "Number", 0, 0, 0), 10);
+}
+
+TEST_F(IniFileTest, WithoutAFileNameNothingIsStored) {
+    IniFile fresh(profiles_);
+    EXPECT_EQ(fresh.FileName(), "");
+    fresh.WriteString("S", "k", "v");
+    EXPECT_EQ(fresh.ReadString("S", "k", "default"), "default");
+    EXPECT_EQ(fresh.Encrypt("3"), "qt") << "the default key";
+}
+
+}  // namespace
+}  // namespace cv
