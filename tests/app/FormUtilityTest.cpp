@@ -1,0 +1,91 @@
+#include <QComboBox>
+#include <QGroupBox>
+#include <QGuiApplication>
+#include <QLineEdit>
+#include <QListWidget>
+#include <QPushButton>
+#include <QScreen>
+#include <QVBoxLayout>
+#include <QtTest>
+
+#include "app/FormUtility.h"
+
+class FormUtilityTest : public QObject {
+    Q_OBJECT
+
+  private slots:
+    void busyDisablesFramesAndButtonsExceptCancel() {
+        QWidget form;
+        auto* frame = new QGroupBox(&form);
+        auto* inFrame = new QLineEdit(frame);
+        auto* ok = new QPushButton(&form);
+        auto* cancel = new QPushButton(&form);
+        cancel->setProperty("Tag", QStringLiteral("Cancel"));
+        auto* loose = new QLineEdit(&form);
+
+        cv::SetControlsBusy(11, form);
+        QVERIFY(!frame->isEnabled());
+        QVERIFY(!inFrame->isEnabled());
+        QVERIFY(!ok->isEnabled());
+        QVERIFY(cancel->isEnabled());
+        QVERIFY(loose->isEnabled());
+        QCOMPARE(form.cursor().shape(), Qt::WaitCursor);
+
+        cv::SetControlsBusy(0, form);
+        QVERIFY(frame->isEnabled());
+        QVERIFY(inFrame->isEnabled());
+        QVERIFY(ok->isEnabled());
+        QCOMPARE(form.cursor().shape(), Qt::ArrowCursor);
+    }
+
+    void busyLeavesACancelButtonAsItWas() {
+        QWidget form;
+        auto* cancel = new QPushButton(&form);
+        cancel->setProperty("Tag", QStringLiteral("Cancel"));
+        cancel->setEnabled(false);
+        cv::SetControlsBusy(0, form);
+        QVERIFY(!cancel->isEnabled());
+    }
+
+    void findsExactEntries() {
+        QComboBox combo;
+        combo.addItems({"Beta", "alpha", "Alpha"});
+        QCOMPARE(cv::FindListEntry(combo, "Alpha"), int16_t{2});
+        QCOMPARE(cv::FindListEntry(combo, "ALPHA"), int16_t{-1});
+        QListWidget list;
+        QCOMPARE(cv::FindListEntry(list, "x"), int16_t{-1});
+        list.addItems({"x", "y"});
+        QCOMPARE(cv::FindListEntry(list, "y"), int16_t{1});
+        QLineEdit notAList("y");
+        QCOMPARE(cv::FindListEntry(notAList, "y"), int16_t{-1});
+        QCOMPARE(cv::FindListEntry(notAList, "y", 0), int16_t{-1});
+    }
+
+    void findsThePlaceInASortedListIgnoringCase() {
+        QListWidget list;
+        list.addItems({"apple", "Cherry", "melon"});
+        QCOMPARE(cv::FindListEntry(list, "BANANA", 0), int16_t{1});
+        QCOMPARE(cv::FindListEntry(list, "cherry", 0), int16_t{1});
+        QCOMPARE(cv::FindListEntry(list, "a", 1), int16_t{0});
+        QCOMPARE(cv::FindListEntry(list, "zucchini", 0), int16_t{-1});
+    }
+
+    void centresOnTheScreen() {
+        QWidget form;
+        form.resize(200, 100);
+        form.show();
+        QVERIFY(QTest::qWaitForWindowExposed(&form));
+        const QRect screen = form.screen()->geometry();
+        const QSize size = form.frameGeometry().size();
+        cv::CenterForm(form, 0);
+        QCOMPARE(form.frameGeometry().topLeft(),
+                 QPoint(screen.left() + screen.width() / 2 - size.width() / 2,
+                        screen.top() + screen.height() / 2 - size.height() / 2));
+        const QPoint centred = form.frameGeometry().topLeft();
+        cv::CenterForm(form, 30);
+        QCOMPARE(form.frameGeometry().topLeft(), centred + QPoint(30, 30));
+    }
+};
+
+QTEST_MAIN(FormUtilityTest)
+#include "FormUtilityTest.moc"
