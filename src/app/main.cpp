@@ -1,1 +1,97 @@
-int main() { return 0; }
+// The program: builds the production platform and shows the main window;
+// closing it ends the run.
+//
+//   cvopctestclient [--quit-when-shown] [Qt options]
+//
+// --quit-when-shown  ends the program as soon as the main window has been
+//                    drawn for the first time (used to measure start-up).
+
+#include <QApplication>
+#include <cstdio>
+#include <cstdlib>
+#include <string_view>
+
+#include "app/Utility.h"
+#include "app/frmOpcTestClient.h"
+#include "platform/posix/HostComputerName.h"
+#include "platform/posix/PosixProgramInfo.h"
+#include "platform/qt/HelpWindow.h"
+#include "platform/qt/QtDialogs.h"
+#include "platform/qt/QtEventLoop.h"
+#include "platform/qt/QtLocale.h"
+
+namespace {
+
+constexpr const char* kUsage =
+    "usage: cvopctestclient [--quit-when-shown] [Qt options]\n"
+    "  --quit-when-shown  end as soon as the main window has been drawn (start-up timing)\n";
+
+bool IsSet(const char* variable) {
+    const char* value = std::getenv(variable);
+    return value != nullptr && *value != '\0';
+}
+
+// Qt can show a window when a display server is named or a platform plugin
+// is chosen, in the environment or with -platform.
+bool HasDisplay(int argc, char** argv) {
+    for (int i = 1; i < argc; ++i) {
+        const std::string_view argument(argv[i]);
+        if (argument == "-platform" || argument == "--platform") {
+            return true;
+        }
+    }
+    return IsSet("DISPLAY") || IsSet("WAYLAND_DISPLAY") || IsSet("QT_QPA_PLATFORM");
+}
+
+// Ends the event loop after the watched window's first paint.
+class QuitWhenPainted : public QObject {
+  public:
+    bool eventFilter(QObject* watched, QEvent* event) override {
+        if (event->type() == QEvent::Paint) {
+            watched->removeEventFilter(this);
+            QMetaObject::invokeMethod(qApp, &QCoreApplication::quit, Qt::QueuedConnection);
+        }
+        return false;
+    }
+};
+
+}  // namespace
+
+int main(int argc, char** argv) {
+    bool quitWhenShown = false;
+    for (int i = 1; i < argc; ++i) {
+        const std::string_view argument(argv[i]);
+        if (argument == "--quit-when-shown") {
+            quitWhenShown = true;
+        } else if (argument == "--help" || argument == "-h") {
+            std::fputs(kUsage, stdout);
+            return 0;
+        }
+    }
+    if (!HasDisplay(argc, argv)) {
+        std::fputs(
+            "cvopctestclient: there is no display to show the window on (DISPLAY and "
+            "WAYLAND_DISPLAY are unset).\nRun it in a desktop session, or under xvfb-run "
+            "(xvfb-run cvopctestclient).\n",
+            stderr);
+        return 1;
+    }
+
+    QApplication application(argc, argv);
+    cv::qtui::QtDialogs dialogs(cv::ProgramTitle());
+    cv::qtui::QtLocale locale;
+    cv::posix::PosixProgramInfo program;
+    cv::qtui::HelpWindow help;
+    cv::posix::HostComputerName computer;
+    cv::qtui::QtEventLoop events;
+    cv::RunSwitches run;
+    cv::Platform platform{dialogs, locale, program, help, computer, events, run};
+
+    QuitWhenPainted quitter;
+    cv::frmOpcTestClient window(platform);
+    if (quitWhenShown) {
+        window.installEventFilter(&quitter);
+    }
+    window.show();
+    return QApplication::exec();
+}

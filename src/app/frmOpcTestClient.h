@@ -1,0 +1,103 @@
+#pragma once
+
+#include <QPointer>
+#include <QWidget>
+#include <deque>
+#include <string>
+
+#include "channel/Channel.h"
+#include "document/TunFile.h"
+#include "platform/Platform.h"
+
+class QCheckBox;
+class QCloseEvent;
+class QGroupBox;
+class QLabel;
+class QLineEdit;
+class QPushButton;
+
+namespace cv {
+
+// The main window: names one OPC item (server, access path, item ID), its
+// scaling ranges and the sample interval, and starts the test read. Each
+// field is checked and written through to the channel or the document's
+// general settings when the focus leaves it for another control.
+class frmOpcTestClient : public QWidget {
+    Q_OBJECT
+
+  public:
+    explicit frmOpcTestClient(Platform& platform, QWidget* parent = nullptr);
+
+    TunFile& Document() { return mcTunFile; }
+    Channel& TestChannel() { return mcChannel; }
+
+  protected:
+    bool eventFilter(QObject* watched, QEvent* event) override;
+    void closeEvent(QCloseEvent* event) override;
+
+  private:
+    // Building and loading (frmOpcTestClient.cpp).
+    void CreateControls();
+    QGroupBox* CreateAddressFrame();
+    QGroupBox* CreateScalingFrame();
+    QWidget* CreateSampleIntervalRow();
+    QWidget* CreateButtonRow();
+    void SetTabOrder();
+    void WatchFields();
+    void Load();
+    void ApplyRememberedValues();
+    void FillFields();
+    void chkUseScaling_Click();
+    void cmdHelp_Click();
+    void cmdClose_Click();
+
+    // Field checks (frmOpcTestClient_validate.cpp).
+    void QueueValidation(QWidget* field);
+    bool RunPendingValidations();
+    bool Validate(QWidget* field);
+    bool ValidateRangeBox(QLineEdit& box, const std::string& sSpanName, RangeType eRange,
+                          bool bIsMax, double dOtherLimit);
+    bool CheckMinMax(double dMin, double dMax, const std::string& sSpanName);
+    bool ValidateSI();
+    std::string RangeText(double dValue) const;
+
+    Platform& mPlatform;
+    TunFile mcTunFile;
+    Channel mcChannel;
+    // Fields whose checks wait to run, oldest first; while a check shows a
+    // message, no other check starts.
+    std::deque<QPointer<QWidget>> mPendingValidations;
+    bool mbValidating = false;
+
+    QGroupBox* Frame1 = nullptr;
+    QLabel* Label1 = nullptr;
+    QLineEdit* txtServerID = nullptr;
+    QPushButton* cmdBrowseServers = nullptr;
+    QLabel* Label2 = nullptr;
+    QLineEdit* txtAccessPath = nullptr;
+    QLabel* Label3 = nullptr;
+    QLineEdit* txtItemID = nullptr;
+    QPushButton* cmdBrowseItems = nullptr;
+    QPushButton* cmdTest = nullptr;
+    QGroupBox* fraScaling = nullptr;
+    QLabel* Label8 = nullptr;
+    QCheckBox* chkUseScaling = nullptr;
+    QGroupBox* fraScalingValues = nullptr;
+    QLabel* Label5 = nullptr;
+    QLabel* Label4 = nullptr;
+    QLabel* Label6 = nullptr;
+    QLineEdit* txtEngMin = nullptr;
+    QLineEdit* txtEngMax = nullptr;
+    QLabel* Label7 = nullptr;
+    QLineEdit* txtInstMin = nullptr;
+    QLineEdit* txtInstMax = nullptr;
+    QLabel* Label9 = nullptr;
+    QLineEdit* txtSI = nullptr;
+    QLabel* Label10 = nullptr;
+    QPushButton* cmdHelp = nullptr;
+    QPushButton* cmdClose = nullptr;
+    QLabel* lblVersion = nullptr;
+    QLabel* lblCopyright = nullptr;
+};
+
+}  // namespace cv

@@ -1,0 +1,154 @@
+#include <QCheckBox>
+#include <QCloseEvent>
+#include <QFocusEvent>
+#include <QLineEdit>
+#include <cmath>
+
+#include "app/Utility.h"
+#include "app/frmOpcTestClient.h"
+
+namespace cv {
+
+namespace {
+
+// Focus moves that check the field left behind: the user going to another
+// control of this window. Focus lost to another window (a message box, the
+// help window) or moved by the program checks nothing.
+bool ChecksField(Qt::FocusReason reason) {
+    return reason == Qt::TabFocusReason || reason == Qt::BacktabFocusReason ||
+           reason == Qt::MouseFocusReason || reason == Qt::ShortcutFocusReason;
+}
+
+std::string TrimmedText(const QLineEdit& box) {
+    return box.text().trimmed().toStdString();
+}
+
+}  // namespace
+
+bool frmOpcTestClient::eventFilter(QObject* watched, QEvent* event) {
+    if (event->type() == QEvent::FocusOut &&
+        ChecksField(static_cast<QFocusEvent*>(event)->reason())) {
+        QueueValidation(qobject_cast<QWidget*>(watched));
+    }
+    return QWidget::eventFilter(watched, event);
+}
+
+void frmOpcTestClient::QueueValidation(QWidget* field) {
+    // The check runs once the focus change is complete, not inside it, so
+    // that a message box and the return of the focus are ordinary events.
+    // A mouse press that moved the focus has been delivered by then, and the
+    // box takes the focus from the pressed button, which then never clicks.
+    mPendingValidations.emplace_back(field);
+    QMetaObject::invokeMethod(
+        this, [this] { RunPendingValidations(); }, Qt::QueuedConnection);
+}
+
+bool frmOpcTestClient::RunPendingValidations() {
+    if (mbValidating) {
+        return false;  // a check is showing a message; it runs the rest after it
+    }
+    mbValidating = true;
+    bool bPassed = true;
+    while (bPassed && !mPendingValidations.empty()) {
+        const QPointer<QWidget> field = mPendingValidations.front();
+        mPendingValidations.pop_front();
+        if (field && !Validate(field)) {
+            // The focus goes back to the field; later moves never happened.
+            mPendingValidations.clear();
+            field->setFocus(Qt::OtherFocusReason);
+            bPassed = false;
+        }
+    }
+    mbValidating = false;
+    return bPassed;
+}
+
+void frmOpcTestClient::closeEvent(QCloseEvent* event) {
+    // A focus move made just before closing is still checked; the window
+    // closes either way, as closing never checks the field that has the focus.
+    RunPendingValidations();
+    QWidget::closeEvent(event);
+}
+
+bool frmOpcTestClient::Validate(QWidget* field) {
+    Channel& channel = mcChannel;
+    if (field == txtServerID) {
+        channel.SetOpcNodeAndServer(TrimmedText(*txtServerID));
+    } else if (field == txtAccessPath) {
+        channel.SetOpcAccessPath(TrimmedText(*txtAccessPath));
+    } else if (field == txtItemID) {
+        channel.SetItemName(TrimmedText(*txtItemID));
+    } else if (field == chkUseScaling) {
+        mcTunFile.General().SetScalePVandCO(chkUseScaling->isChecked());
+    } else if (field == txtEngMin) {
+        return ValidateRangeBox(*txtEngMin, "Eng span", RangeType::Engineering, false,
+                                channel.EngMax());
+    } else if (field == txtEngMax) {
+        return ValidateRangeBox(*txtEngMax, "Eng span", RangeType::Engineering, true,
+                                channel.EngMin());
+    } else if (field == txtInstMin) {
+        return ValidateRangeBox(*txtInstMin, "Inst span", RangeType::Instrument, false,
+                                channel.InstMax());
+    } else if (field == txtInstMax) {
+        return ValidateRangeBox(*txtInstMax, "Inst span", RangeType::Instrument, true,
+                                channel.InstMin());
+    } else if (field == txtSI) {
+        return ValidateSI();
+    }
+    return true;
+}
+
+bool frmOpcTestClient::ValidateRangeBox(QLineEdit& box, const std::string& sSpanName,
+                                        RangeType eRange, bool bIsMax, double dOtherLimit) {
+    const float v = TextToSingle(mPlatform, box.text().toStdString());
+    // The box shows single-precision numbers, so the held limit is compared
+    // at that precision.
+    if (v == static_cast<float>(mcChannel.GetRangeValue(eRange, bIsMax ? 1 : 0))) {
+        return true;
+    }
+    const double dMin = bIsMax ? dOtherLimit : v;
+    const double dMax = bIsMax ? v : dOtherLimit;
+    if (CheckMinMax(dMin, dMax, sSpanName)) {
+        mcChannel.SetRange(eRange, dMin, dMax);
+        return true;
+    }
+    box.setText(QString::fromStdString(RangeText(v)));
+    return false;
+}
+
+bool frmOpcTestClient::CheckMinMax(double dMin, double dMax, const std::string& sSpanName) {
+    if (dMin <= dMax) {
+        if (std::fabs(dMax - dMin) >= 0.05) {
+            return true;
+        }
+        mPlatform.dialogs.MsgBox(sSpanName + " Min must be more than .05 from Max.",
+                                 MsgBoxStyle::Exclamation, "");
+        return false;
+    }
+    mPlatform.dialogs.MsgBox(sSpanName + " Min must be less than Max.", MsgBoxStyle::Exclamation,
+                             "");
+    return false;
+}
+
+bool frmOpcTestClient::ValidateSI() {
+    TunFileGeneral& general = mcTunFile.General();
+    if (TrimmedText(*txtSI) == FormatFloat(mPlatform.locale, general.SIinSec(), 4)) {
+        return true;
+    }
+    const float v = TextToSingle(mPlatform, txtSI->text().toStdString());
+    if (v >= 0.1 && v <= 61) {
+        general.SetSIinSec(v);
+        // The interval in use, after the settings have rounded it.
+        txtSI->setText(QString::fromStdString(FormatFloat(mPlatform.locale, general.SIinSec(), 4)));
+        return true;
+    }
+    mPlatform.dialogs.MsgBox("Must be less than 61 and greater or equal to .1",
+                             MsgBoxStyle::Exclamation, "");
+    return false;
+}
+
+std::string frmOpcTestClient::RangeText(double dValue) const {
+    return FormatFloat(mPlatform.locale, dValue, 7);
+}
+
+}  // namespace cv

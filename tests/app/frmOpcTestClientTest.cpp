@@ -1,0 +1,312 @@
+#include <QCheckBox>
+#include <QGroupBox>
+#include <QLabel>
+#include <QLineEdit>
+#include <QPushButton>
+#include <QtTest>
+#include <memory>
+
+#include "app/Utility.h"
+#include "app/frmOpcTestClient.h"
+#include "support/TestPlatform.h"
+
+using cv::frmOpcTestClient;
+using cv::RangeType;
+
+namespace {
+
+const std::string kEngTooClose = "Eng span Min must be more than .05 from Max.";
+const std::string kSIRange = "Must be less than 61 and greater or equal to .1";
+
+}  // namespace
+
+class frmOpcTestClientTest : public QObject {
+    Q_OBJECT
+
+  private:
+    std::unique_ptr<cv::test::TestPlatform> tp;
+    std::unique_ptr<frmOpcTestClient> window;
+
+    QLineEdit* Box(const char* name) { return window->findChild<QLineEdit*>(name); }
+    template <typename Widget = QWidget>
+    Widget* Control(const char* name) {
+        return window->findChild<Widget*>(name);
+    }
+    cv::Channel& Channel() { return window->TestChannel(); }
+    const std::vector<cv::fake::ScriptedDialogs::Shown>& Messages() {
+        return tp->dialogs.Messages();
+    }
+
+    // Types text into a box as the user would: the box gets the focus and
+    // its old text is replaced.
+    void Type(const char* name, const QString& text) {
+        QLineEdit* box = Box(name);
+        box->setFocus();
+        QTRY_VERIFY(box->hasFocus());
+        box->selectAll();
+        QTest::keyClicks(box, text);
+    }
+    // Leaves the focused control with a key and lets its check run.
+    void Leave(Qt::Key key = Qt::Key_Tab) {
+        QTest::keyClick(QApplication::focusWidget(), key);
+        QCoreApplication::processEvents();
+    }
+    void Enter(const char* name, const QString& text) {
+        Type(name, text);
+        Leave();
+    }
+    QString Focused() {
+        return QApplication::focusWidget() ? QApplication::focusWidget()->objectName() : QString();
+    }
+
+  private slots:
+    void init() {
+        tp = std::make_unique<cv::test::TestPlatform>();
+        window = std::make_unique<frmOpcTestClient>(tp->platform);
+        window->show();
+        window->activateWindow();
+        QVERIFY(QTest::qWaitForWindowActive(window.get()));
+    }
+    void cleanup() {
+        window.reset();
+        tp.reset();
+    }
+
+    void firstRunShowsTheDefaults() {
+        QCOMPARE(Box("txtServerID")->text(), QString());
+        QCOMPARE(Box("txtAccessPath")->text(), QString());
+        QCOMPARE(Box("txtItemID")->text(), QString());
+        QCOMPARE(Box("txtEngMin")->text(), QStringLiteral("0"));
+        QCOMPARE(Box("txtEngMax")->text(), QStringLiteral("100"));
+        QCOMPARE(Box("txtInstMin")->text(), QStringLiteral("0"));
+        QCOMPARE(Box("txtInstMax")->text(), QStringLiteral("100"));
+        QVERIFY(Control<QCheckBox>("chkUseScaling")->isChecked());
+        QVERIFY(Control("fraScalingValues")->isEnabled());
+        QCOMPARE(Box("txtSI")->text().toStdString(), cv::FormatFloat(tp->locale, 1.0, 4));
+        QCOMPARE(Channel().DecimalPlaces(), 2);
+        QCOMPARE(Channel().LineColor(), 65280);
+        QCOMPARE(Channel().Number(), 3);
+        QVERIFY(window->Document().General().ScalePVandCO());
+        QCOMPARE(window->Document().TunerType(), 9);
+        QVERIFY(Messages().empty());
+    }
+
+    void showsVersionNoticeAndCaptions() {
+        QCOMPARE(window->windowTitle(), QStringLiteral("Corvalent OPC Test Client"));
+        QCOMPARE(Control<QLabel>("lblVersion")->text(), QStringLiteral("Version 13.2.1"));
+        QCOMPARE(Control<QLabel>("lblCopyright")->text(),
+                 QStringLiteral("Copyright (C) Corvalent"));
+        QCOMPARE(Control<QGroupBox>("Frame1")->title(), QStringLiteral("OPC Addresses"));
+        QCOMPARE(Control<QGroupBox>("fraScaling")->title(), QStringLiteral("Scaling"));
+        const std::pair<const char*, const char*> labels[] = {{"Label1", "\\\\Node\\Server :"},
+                                                              {"Label2", "Access path :"},
+                                                              {"Label3", "Item name :"},
+                                                              {"Label8", "Scale the incoming"},
+                                                              {"Label5", "Min"},
+                                                              {"Label4", "Max"},
+                                                              {"Label6", "Eng span :"},
+                                                              {"Label7", "Inst span :"},
+                                                              {"Label9", "Sample interval :"},
+                                                              {"Label10", "(sec)"}};
+        for (const auto& [name, caption] : labels) {
+            QCOMPARE(Control<QLabel>(name)->text(), QString::fromUtf8(caption));
+        }
+        QCOMPARE(Control<QCheckBox>("chkUseScaling")->text(), QStringLiteral("value"));
+        QCOMPARE(Control<QPushButton>("cmdBrowseServers")->toolTip(),
+                 QStringLiteral("Browse for OPC Servers"));
+        QCOMPARE(Control<QPushButton>("cmdBrowseItems")->toolTip(),
+                 QStringLiteral("Browse for OPC Items"));
+        QCOMPARE(Control<QPushButton>("cmdTest")->text(), QStringLiteral("Test read"));
+        QCOMPARE(Control<QPushButton>("cmdHelp")->text(), QStringLiteral("Help"));
+        QCOMPARE(Control<QPushButton>("cmdClose")->text(), QStringLiteral("Close"));
+        QVERIFY(!Control("cmdTest")->isEnabled());
+        QVERIFY(!Control("cmdBrowseServers")->isEnabled());
+    }
+
+    void helpShowsTopicOneOfTheProgramHelpFile() {
+        QCOMPARE(tp->run.HelpFile.substr(0, tp->program.folder.size()), tp->program.folder);
+        QVERIFY(QString::fromStdString(tp->run.HelpFile).endsWith("CvOpcTestClient.hlp>StepsSub"));
+        QTest::mouseClick(Control("cmdHelp"), Qt::LeftButton);
+        QCOMPARE(tp->help.requests.size(), size_t{1});
+        QCOMPARE(tp->help.requests[0].context, 1);
+        QCOMPARE(tp->help.requests[0].file, tp->run.HelpFile);
+    }
+
+    void rangeTooNarrowIsRefusedAndKeepsTheFocus() {
+        Enter("txtEngMax", "0.03");
+        QCOMPARE(Messages().size(), size_t{1});
+        QCOMPARE(Messages()[0].text, kEngTooClose);
+        QCOMPARE(Messages()[0].style, 48);
+        QCOMPARE(Messages()[0].title, std::string());
+        QCOMPARE(Focused(), QStringLiteral("txtEngMax"));
+        QCOMPARE(Box("txtEngMax")->text(), QStringLiteral("0.03"));
+        QCOMPARE(Channel().EngMax(), 100.0);
+    }
+
+    void minimumAboveMaximumIsRefused() {
+        Enter("txtInstMax", "4");
+        QVERIFY(Messages().empty());
+        QCOMPARE(Channel().InstMax(), 4.0);
+        QCOMPARE(Focused(), QStringLiteral("txtSI"));
+        Type("txtInstMin", "5");
+        Leave(Qt::Key_Backtab);
+        QCOMPARE(Messages().size(), size_t{1});
+        QCOMPARE(Messages()[0].text, std::string("Inst span Min must be less than Max."));
+        QCOMPARE(Focused(), QStringLiteral("txtInstMin"));
+        QCOMPARE(Channel().InstMin(), 0.0);
+        // A valid value then passes and reaches the channel.
+        Enter("txtInstMin", "-4");
+        QCOMPARE(Messages().size(), size_t{1});
+        QCOMPARE(Channel().InstMin(), -4.0);
+        QCOMPARE(Channel().ScaleFactor(), 100.0 / 8.0);
+    }
+
+    void theHeldValuePassesWithoutACheck() {
+        // A range the check would refuse, held by the channel.
+        Channel().SetRange(RangeType::Engineering, 100, 100.02);
+        Enter("txtEngMax", "100.02");
+        QVERIFY(Messages().empty());
+        QCOMPARE(Channel().EngMax(), 100.02);
+        QCOMPARE(Focused(), QStringLiteral("txtInstMin"));
+    }
+
+    void mouseMoveChecksButLosingActivationDoesNot() {
+        Type("txtEngMax", "0.03");
+        QWidget other;
+        other.show();
+        other.activateWindow();
+        QVERIFY(QTest::qWaitForWindowActive(&other));
+        QCoreApplication::processEvents();
+        QVERIFY(Messages().empty());
+        window->activateWindow();
+        QVERIFY(QTest::qWaitForWindowActive(window.get()));
+        QCOMPARE(Focused(), QStringLiteral("txtEngMax"));
+
+        QTest::mouseClick(Box("txtInstMin"), Qt::LeftButton);
+        QCoreApplication::processEvents();
+        QCOMPARE(Messages().size(), size_t{1});
+        QCOMPARE(Messages()[0].text, kEngTooClose);
+        QCOMPARE(Focused(), QStringLiteral("txtEngMax"));
+    }
+
+    void aRefusedFieldCancelsTheMovesThatFollowedIt() {
+        Type("txtEngMax", "0.03");
+        QTest::keyClick(Box("txtEngMax"), Qt::Key_Tab);
+        // Before the first check runs, the next box is changed and left too.
+        QTest::keyClicks(Box("txtInstMin"), "7");
+        QTest::keyClick(Box("txtInstMin"), Qt::Key_Tab);
+        QCoreApplication::processEvents();
+        QCOMPARE(Messages().size(), size_t{1});
+        QCOMPARE(Focused(), QStringLiteral("txtEngMax"));
+        QCOMPARE(Channel().InstMin(), 0.0);
+    }
+
+    void aButtonWaitsForThePendingCheck() {
+        Type("txtEngMax", "0.03");
+        // Press and release arrive before the queued check has run.
+        QTest::mouseClick(Control("cmdHelp"), Qt::LeftButton);
+        QCOMPARE(Messages().size(), size_t{1});
+        QVERIFY(tp->help.requests.empty());
+        QCOMPARE(Focused(), QStringLiteral("txtEngMax"));
+        QCoreApplication::processEvents();
+        QCOMPARE(Messages().size(), size_t{1});
+    }
+
+    void sampleIntervalLimits() {
+        Enter("txtSI", "0.1");
+        QVERIFY(Messages().empty());
+        QCOMPARE(window->Document().General().SIinMSec(), 100);
+        QCOMPARE(Box("txtSI")->text().toStdString(), cv::FormatFloat(tp->locale, 0.1, 4));
+        Enter("txtSI", "61");
+        QVERIFY(Messages().empty());
+        QCOMPARE(window->Document().General().SIinMSec(), 61000);
+
+        for (const char* refused : {"0.09", "61.5"}) {
+            tp->dialogs.Clear();
+            Enter("txtSI", refused);
+            QCOMPARE(Messages().size(), size_t{1});
+            QCOMPARE(Messages()[0].text, kSIRange);
+            QCOMPARE(Messages()[0].style, 48);
+            QCOMPARE(Focused(), QStringLiteral("txtSI"));
+            QCOMPARE(window->Document().General().SIinMSec(), 61000);
+        }
+    }
+
+    void sampleIntervalShowsTheIntervalInUse() {
+        // 0.1234 s runs in steps of 5 ms: 0.125 s.
+        Enter("txtSI", "0.1234");
+        QCOMPARE(window->Document().General().SIinMSec(), 125);
+        QCOMPARE(Box("txtSI")->text().toStdString(), cv::FormatFloat(tp->locale, 0.125, 4));
+    }
+
+    void junkTextIsQuestionedAndReadAsWellAsPossible() {
+        Enter("txtEngMax", "abc");
+        QCOMPARE(Messages().size(), size_t{2});
+        QCOMPARE(Messages()[0].title, std::string("Conversion errors"));
+        QCOMPARE(Messages()[1].text, kEngTooClose);
+        QCOMPARE(Box("txtEngMax")->text(), QStringLiteral("0"));
+        QCOMPARE(Channel().EngMax(), 100.0);
+    }
+
+    void hugeNumbersNeverReachTheChannel() {
+        Enter("txtEngMax", "1e60");
+        QCOMPARE(Focused(), QStringLiteral("txtEngMax"));
+        QCOMPARE(Box("txtEngMax")->text(), QStringLiteral("1E-05"));
+        QCOMPARE(Channel().EngMax(), 100.0);
+        // Too large for a single: questioned, and read as the error value 1E-5.
+        tp->dialogs.Clear();
+        Enter("txtInstMin", "-1e60");
+        QCOMPARE(Messages().size(), size_t{1});
+        QCOMPARE(Messages()[0].title, std::string("Conversion errors"));
+        QCOMPARE(Channel().InstMin(), double(1E-5F));
+        Enter("txtSI", "1e60");
+        QCOMPARE(Messages().back().text, kSIRange);
+        QCOMPARE(window->Document().General().SIinMSec(), 1000);
+        // The largest single-precision numbers are still ranges.
+        tp->dialogs.Clear();
+        Enter("txtEngMax", "3e38");
+        QVERIFY(Messages().empty());
+        QCOMPARE(Channel().EngMax(), double(3e38f));
+        QVERIFY(std::isfinite(Channel().ScaleFactor()));
+    }
+
+    void serverTextIsSplitIntoNodeAndServer() {
+        Enter("txtServerID", "\\\\PLANT7\\Vendor.Server.1 ");
+        QCOMPARE(Box("txtServerID")->text(), QStringLiteral("\\\\PLANT7\\Vendor.Server.1 "));
+        QCOMPARE(Channel().OpcComputer(), std::string("PLANT7"));
+        QCOMPARE(Channel().OpcServerID(), std::string("Vendor.Server.1"));
+        Enter("txtAccessPath", " Path1 ");
+        QCOMPARE(Channel().OpcAccessPath(), std::string("Path1"));
+        Enter("txtItemID", " Area1.FIC101.PV");
+        QCOMPARE(Channel().ItemName(), std::string("Area1.FIC101.PV"));
+        QVERIFY(Messages().empty());
+    }
+
+    void scalingSwitchEnablesTheRangeBoxes() {
+        auto* scaling = Control<QCheckBox>("chkUseScaling");
+        QTest::mouseClick(scaling, Qt::LeftButton);
+        QVERIFY(!scaling->isChecked());
+        QVERIFY(!Control("fraScalingValues")->isEnabled());
+        for (const char* name : {"txtEngMin", "txtEngMax", "txtInstMin", "txtInstMax"}) {
+            QVERIFY(!Box(name)->isEnabled());
+        }
+        QVERIFY(!window->Document().General().ScalePVandCO());
+        QCOMPARE(Channel().EngMax(), 100.0);
+        QTest::mouseClick(scaling, Qt::LeftButton);
+        QVERIFY(Box("txtEngMin")->isEnabled());
+        QVERIFY(window->Document().General().ScalePVandCO());
+    }
+
+    void closeButtonAndTitleBarClose() {
+        QTest::mouseClick(Control("cmdClose"), Qt::LeftButton);
+        QVERIFY(!window->isVisible());
+        window->show();
+        Type("txtEngMax", "0.03");
+        QVERIFY(window->close());
+        QVERIFY(Messages().empty());
+        QCOMPARE(Channel().EngMax(), 100.0);
+    }
+};
+
+QTEST_MAIN(frmOpcTestClientTest)
+#include "frmOpcTestClientTest.moc"
