@@ -18,7 +18,7 @@ constexpr int32_t kPlainPrecision = 15;
 
 float ToSingleSaturated(double value) {
     if (std::fabs(value) > FLT_MAX) {
-        return std::copysign(FLT_MAX, static_cast<float>(value));
+        return static_cast<float>(std::copysign(static_cast<double>(FLT_MAX), value));
     }
     const auto single = static_cast<float>(value);
     return single == 0.0F ? 0.0F : single;

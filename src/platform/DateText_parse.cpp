@@ -163,12 +163,9 @@ bool ResolveDate(const DateFields& fields, std::string_view format, OleDateParts
         return false;
     }
     const std::string order = n[0].width > 2 ? "yMd" : DateOrder(format);
-    for (size_t i = 0; i < 3; ++i) {
-        const char field = order[i];
-        (field == 'd'   ? parts.day
-         : field == 'M' ? parts.month
-                        : parts.year) = field == 'y' ? FullYear(n[i]) : n[i].value;
-    }
+    parts.day = n[order.find('d')].value;
+    parts.month = n[order.find('M')].value;
+    parts.year = FullYear(n[order.find('y')]);
     OleDateParts swapped = parts;
     std::swap(swapped.day, swapped.month);
     if (!OleDateFromParts(parts) && OleDateFromParts(swapped)) {

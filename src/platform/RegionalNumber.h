@@ -44,12 +44,6 @@ class RegionalNumber {
     ErrorInfo ToI2(int16_t& value) const;
     ErrorInfo ToI4(int32_t& value) const;
 
-    bool Negative() const { return negative_; }
-    // Significant decimal digits (empty for zero); the value is
-    // digits × 10^Exponent().
-    const std::string& Digits() const { return digits_; }
-    int64_t Exponent() const { return exponent_; }
-
   private:
     template <typename Real>
     ErrorInfo ToReal(Real& value, int64_t magnitudeLimit) const;
@@ -57,6 +51,8 @@ class RegionalNumber {
     int64_t Magnitude() const;
 
     bool negative_ = false;
+    // &H / &O numbers keep their bits; others their significant digits
+    // (empty for zero), the value being digits × 10^exponent.
     bool pattern_ = false;
     uint64_t bits_ = 0;
     std::string digits_;
