@@ -1,6 +1,7 @@
 #include "platform/posix/IniDocument.h"
 
 #include <algorithm>
+#include <initializer_list>
 
 namespace cv::posix {
 
@@ -62,6 +63,14 @@ std::string_view Unquote(std::string_view value) {
         return value.substr(1, value.size() - 2);
     }
     return value;
+}
+
+std::string Joined(std::initializer_list<std::string_view> parts) {
+    std::string text;
+    for (const std::string_view part : parts) {
+        text += part;
+    }
+    return text;
 }
 
 bool IsBlankLine(std::string_view text) {
@@ -191,8 +200,7 @@ bool IniDocument::SetValue(std::string_view section, std::string_view key, std::
     if (first.lines[position - 1].end == LineEnd::None) {
         first.lines[position - 1].end = newLineEnd_;
     }
-    first.lines.insert(first.lines.begin() + position,
-                       NewLine(std::string(Trim(key)) + "=" + std::string(value)));
+    first.lines.insert(first.lines.begin() + position, NewLine(Joined({Trim(key), "=", value})));
     first.keys.emplace(lowerKey, position);
     return true;
 }
@@ -223,8 +231,8 @@ void IniDocument::AppendSection(std::string_view section, std::string_view key,
         }
     }
     Block block{true, {}, {}};
-    block.lines.push_back(NewLine("[" + std::string(section) + "]"));
-    block.lines.push_back(NewLine(std::string(key) + "=" + std::string(value)));
+    block.lines.push_back(NewLine(Joined({"[", section, "]"})));
+    block.lines.push_back(NewLine(Joined({key, "=", value})));
     block.keys.emplace(Lower(key), 1);
     blocks_.push_back(std::move(block));
     sections_[Lower(section)].push_back(static_cast<uint32_t>(blocks_.size() - 1));
