@@ -1,0 +1,147 @@
+#include <gtest/gtest.h>
+
+#include <chrono>
+
+#include "channel/Channel.h"
+#include "platform/OleDate.h"
+#include "support/TestPlatform.h"
+
+namespace cv {
+namespace {
+
+constexpr int32_t kGood = 0xC0;
+constexpr int32_t kUncertain = 0x40;
+const std::string kUncertainText =
+    "Uncertain value reported by OPC Server.  The reported reason is :\"Uncertain value - "
+    "Undefined reason\"\r\n\r\nContinue showing this warning in this session?";
+
+struct OpcChannel : testing::Test {
+    OpcChannel() {
+        channel.SetComType(ComTypeCode::Opc);
+        channel.SetDescription("PV");
+    }
+    test::TestPlatform tp;
+    Channel channel{tp.platform};
+};
+
+TEST_F(OpcChannel, ArraysBecomeLinesAndTextsStopAtNul) {
+    channel.SetExpectANumber(false);
+    channel.OpcSetRawValue(
+        Variant::Array(VT_R8, {Variant::R8(1), Variant::R8(2.5), Variant::R8(-3)}, 1), kGood, 4.5,
+        false);
+    EXPECT_EQ(channel.RawValue(), Variant::Str("1\r\n2.5\r\n-3\r\n"));
+    EXPECT_EQ(channel.OpcRawValueVarType(), VT_BSTR);
+    EXPECT_EQ(channel.OpcTimeStamp(), 4.5);
+    channel.OpcSetRawValue(Variant::Str(std::string("ab\0cd", 5)), kGood, 0, false);
+    EXPECT_EQ(channel.RawValue(), Variant::Str("ab"));
+}
+
+TEST_F(OpcChannel, QualityDecidesTheState) {
+    channel.OpcSetRawValue(Variant::R8(1), 0x08, 0, false);  // bad while offline
+    EXPECT_FALSE(channel.IsOnline());
+    EXPECT_EQ(channel.ErrorStr(), "");
+    channel.OpcSetRawValue(Variant::R8(2), 0x15, 0, false);  // last known, low limit
+    EXPECT_TRUE(channel.IsOnline());
+    EXPECT_EQ(channel.RawValue(), Variant::R8(2));
+    channel.OpcSetRawValue(Variant::R8(3), 0x08, 0, false);
+    EXPECT_FALSE(channel.IsOnline());
+    EXPECT_EQ(channel.ErrorStr(), "OPC Server error: \"Not connected\"");
+    EXPECT_EQ(channel.ErrorStr(), "");
+    EXPECT_EQ(channel.OpcRawValueVarType(), 0);  // offline: null
+    channel.OpcSetRawValue(Variant::R8(4), 0x1C, 0, true);
+    EXPECT_EQ(channel.ErrorStr(), "OPC Server error: \"Out of service\"");
+    channel.OpcSetRawValue(Variant::R8(5), 0x00, 0, true);
+    EXPECT_EQ(channel.ErrorStr(), "Bad value of unknown status reported by OPC Server.");
+}
+
+TEST_F(OpcChannel, FirstValueMustBeANumber) {
+    channel.OpcSetRawValue(Variant::Str("abc"), kGood, 0, false);
+    EXPECT_FALSE(channel.IsOnline());
+    EXPECT_EQ(channel.ErrorStr(), "\"abc\" has been sent from the Server.  This is not a number.");
+}
+
+TEST_F(OpcChannel, UncertainWarningOncePerChannelAndNoSilencesAll) {
+    channel.OpcSetRawValue(Variant::R8(7), kUncertain, 0, false);
+    ASSERT_TRUE(channel.IsOnline());
+    ASSERT_EQ(tp.dialogs.Messages().size(), 1u);  // asked while proving the number
+    EXPECT_EQ(tp.dialogs.Last().text, kUncertainText);
+    EXPECT_EQ(tp.dialogs.Last().title, "PV: Uncertain OPC Value");
+    EXPECT_EQ(tp.dialogs.Last().style, 4 + 48);
+    channel.OpcSetRawValue(Variant::R8(8), 0x54, 0, false);  // the mark survives
+    EXPECT_EQ(channel.RawValue(), Variant::R8(8));
+    EXPECT_EQ(tp.dialogs.Messages().size(), 1u);
+
+    Channel hda(tp.platform);
+    hda.SetComType(ComTypeCode::Opc);
+    hda.SetExpectANumber(false);
+    hda.OpcSetRawValue(Variant::R8(1), 0x58, 0, false);
+    hda.SetComType(ComTypeCode::OpcHda);
+    hda.RawValue();
+    ASSERT_EQ(tp.dialogs.Messages().size(), 2u);
+    EXPECT_NE(tp.dialogs.Last().text.find("OPC HDA Server.  The reported reason is :\"Uncertain "
+                                          "value - Sub normal\""),
+              std::string::npos);
+
+    Channel other(tp.platform);
+    other.SetComType(ComTypeCode::Opc);
+    other.SetExpectANumber(false);
+    other.OpcSetRawValue(Variant::R8(1), 0x44, 0, false);
+    tp.dialogs.QueueAnswer(MsgBoxResult::No);
+    other.RawValue();
+    ASSERT_EQ(tp.dialogs.Messages().size(), 3u);
+    EXPECT_NE(tp.dialogs.Last().text.find("\"Uncertain value - Last usable\""), std::string::npos);
+    EXPECT_TRUE(tp.run.UncertainWarningOff);
+    Channel third(tp.platform);
+    third.SetComType(ComTypeCode::Opc);
+    third.OpcSetRawValue(Variant::R8(1), kUncertain, 0, false);
+    third.RawValue();
+    EXPECT_EQ(tp.dialogs.Messages().size(), 3u);
+}
+
+TEST_F(OpcChannel, RequestedTypeConvertsOrEmpties) {
+    test::TestPlatform comma(fake::FixedLocale::Comma());
+    Channel german(comma.platform);
+    german.SetComType(ComTypeCode::Opc);
+    german.OpcSetRawValue(Variant::R8(12.5), kGood, 0, false);
+    german.SetDisplayVarType(VT_BSTR);
+    EXPECT_EQ(german.RawValue(), Variant::Str("12,5"));
+    german.SetDisplayVarType(VT_I2);
+    EXPECT_EQ(german.RawValue(), Variant::I2(12));
+    german.SetExpectANumber(false);
+    german.GoOffline();
+    german.OpcSetRawValue(Variant::Str("x"), kGood, 0, false);
+    EXPECT_EQ(german.RawValue(), Variant());
+}
+
+TEST_F(OpcChannel, TimeOutAndSendResults) {
+    const double dNowUtc = OleDateFromTimePoint(
+        std::chrono::time_point_cast<std::chrono::milliseconds>(std::chrono::system_clock::now()));
+    EXPECT_NEAR(channel.OpcTimeStamp(), dNowUtc, 0.6);      // no value yet: now, in local time
+    EXPECT_EQ(channel.Online(true), OnlineState::Offline);  // only a waiting channel times out
+    channel.OpcSetRawValue(Variant::R8(1), kGood, 0, false);
+    EXPECT_EQ(channel.Online(true), OnlineState::Online);
+    EXPECT_EQ(channel.ErrorStr(), "");
+    channel.OpcDataChange("refused");
+    EXPECT_EQ(channel.SendResult(), 2);
+    EXPECT_EQ(channel.ErrorStr(), "refused");
+    channel.OpcDataChange("");
+    EXPECT_EQ(channel.SendResult(), 0);
+}
+
+TEST(ChannelComms, OpcMembersByChannelTypeAndGenericCodes) {
+    test::TestPlatform tp;
+    Channel channel(tp.platform);
+    for (int32_t lType : {0, 4, 11, 13, 14, 5, 10, 12, 15}) {
+        channel.SetSpecificChannelType(lType);
+        EXPECT_EQ(channel.OpcIsActive(), lType <= 4 || lType == 11 || lType == 13 || lType == 14);
+        EXPECT_EQ(channel.OpcGroupNumber(), lType == 13 ? 2 : 1);
+    }
+    EXPECT_EQ(tp.dialogs.Last().text, "Channel.OpcIsActive fault");
+    channel.SetComType(7);
+    channel.GoOffline();
+    EXPECT_EQ(tp.dialogs.Last().text, "Error: Channel.GoOffline");
+    EXPECT_EQ(tp.dialogs.Messages().size(), 2u);
+}
+
+}  // namespace
+}  // namespace cv
