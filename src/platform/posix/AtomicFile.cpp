@@ -153,7 +153,16 @@ FileRead AtomicFile::Read() const {
 }
 
 FileStamp AtomicFile::Stamp() const {
-    return FileStamp::OfPath(msPath);
+    if (!Locked()) {
+        return FileStamp::OfPath(msPath);
+    }
+    auto pin =
+        std::make_shared<UniqueFd>(::open(msLockedTarget.c_str(), O_RDONLY | O_CLOEXEC | O_NOCTTY));
+    struct stat info {};
+    if (!pin->Valid() || ::fstat(pin->Get(), &info) != 0) {
+        return FileStamp::OfPath(msLockedTarget);
+    }
+    return FileStamp::OfStat(info, std::move(pin));
 }
 
 int AtomicFile::Lock() {

@@ -65,7 +65,9 @@ class AtomicFile {
     // The whole file. Needs no lock: writers only ever rename whole files in.
     // While this object holds the lock, reads the locked version.
     FileRead Read() const;
-    // The current version's stamp, without reading (one stat).
+    // The current version's stamp, without reading (one stat). While this
+    // object holds the lock: the locked version's stamp, which keeps that
+    // version's inode pinned like a stamp from Read.
     FileStamp Stamp() const;
 
     int Lock();

@@ -1,0 +1,188 @@
+#include <signal.h>
+#include <sys/wait.h>
+#include <unistd.h>
+
+#include <gtest/gtest.h>
+
+#include <filesystem>
+#include <fstream>
+#include <random>
+#include <sstream>
+
+#include "platform/posix/FileRegistry.h"
+#include "platform/posix/RegistryFile.h"
+#include "support/TempFolder.h"
+
+namespace cv::posix {
+namespace {
+
+using namespace platform;
+
+constexpr const char* kKey = "Software\\Stress";
+
+// Long enough that a replace takes a while, and checkable for tearing.
+std::string Pattern(int32_t lRound) {
+    std::string text = "round " + std::to_string(lRound) + ":";
+    for (int i = 0; i < 4000; ++i) {
+        text += static_cast<char>('a' + (lRound * 7 + i) % 26);
+    }
+    return text + '\0';
+}
+
+std::string DwordBytes(int32_t lValue) {
+    return std::string(reinterpret_cast<char*>(&lValue), 4);
+}
+
+int32_t Put(FileRegistry& cRegistry, int32_t lRoot, const std::string& sName, int32_t lType,
+            const std::string& sData) {
+    RegistryApi::Key key = 0;
+    int32_t result = cRegistry.CreateKey(lRoot, kKey, kKeyAllAccess, key);
+    if (result == kErrorSuccess) {
+        result = cRegistry.SetValue(key, sName, lType, sData);
+        cRegistry.CloseKey(key);
+    }
+    return result;
+}
+
+// The child: from round lFirst on, writes the counter and the pattern to the
+// user's file and the round to the machine's file, then reports the round
+// as done. Runs until killed.
+[[noreturn]] void WriteRounds(const std::string& sFolder, int32_t lFirst, int iReport) {
+    FileRegistry registry(sFolder, FileRegistry::MachineAccess::ReadWrite);
+    for (int32_t round = lFirst;; ++round) {
+        if (Put(registry, kHkeyCurrentUser, "Counter", kRegDword, DwordBytes(round)) != 0 ||
+            Put(registry, kHkeyCurrentUser, "State", kRegSz, Pattern(round)) != 0 ||
+            Put(registry, kHkeyLocalMachine, "Round", kRegDword, DwordBytes(round)) != 0 ||
+            ::write(iReport, &round, sizeof round) != sizeof round) {
+            ::_exit(1);
+        }
+    }
+}
+
+// Reads one root's file strictly: it must be whole and undamaged.
+RegistryKey ReadWhole(const std::string& sPath) {
+    std::ifstream in(sPath, std::ios::binary);
+    std::ostringstream text;
+    text << in.rdbuf();
+    bool damaged = true;
+    RegistryKey root = RegistryFile::Parse(text.str(), damaged);
+    EXPECT_FALSE(damaged) << sPath;
+    return root;
+}
+
+int32_t DwordAt(const RegistryKey& cRoot, const std::string& sName) {
+    const RegistryKey* key = cRoot.Find({"Software", "Stress"});
+    const RegistryValue* value = key == nullptr ? nullptr : key->Value(sName);
+    if (value == nullptr || value->Type != kRegDword || value->Data.size() != 4) {
+        ADD_FAILURE() << sName << " missing";
+        return -100;
+    }
+    int32_t number = 0;
+    std::copy(value->Data.begin(), value->Data.end(), reinterpret_cast<char*>(&number));
+    return number;
+}
+
+int32_t PatternRound(const RegistryKey& cRoot) {
+    const RegistryValue* value = cRoot.Find({"Software", "Stress"})->Value("State");
+    if (value == nullptr) {
+        ADD_FAILURE() << "State missing";
+        return -100;
+    }
+    const int32_t round = std::stoi(value->Data.substr(6));
+    EXPECT_EQ(value->Data, Pattern(round)) << "a torn value";
+    return round;
+}
+
+// Starts a writer, lets it finish a random number of rounds, kills it at a
+// random moment of the next one; returns the last round it reported.
+int32_t RunAndKill(const std::string& sFolder, int32_t lFirst, std::mt19937& cRandom) {
+    int report[2];
+    EXPECT_EQ(::pipe(report), 0);
+    const pid_t child = ::fork();
+    if (child == 0) {
+        ::close(report[0]);
+        WriteRounds(sFolder, lFirst, report[1]);
+    }
+    ::close(report[1]);
+    const int wanted = std::uniform_int_distribution<int>(1, 6)(cRandom);
+    int32_t last = lFirst - 1;
+    for (int got = 0; got < wanted; ++got) {
+        EXPECT_EQ(::read(report[0], &last, sizeof last), static_cast<ssize_t>(sizeof last));
+    }
+    volatile int spin = 0;
+    for (int i = std::uniform_int_distribution<int>(0, 400000)(cRandom); i > 0; --i) {
+        spin = spin + 1;
+    }
+    ::kill(child, SIGKILL);
+    int status = 0;
+    ::waitpid(child, &status, 0);
+    ::close(report[0]);
+    EXPECT_TRUE(WIFSIGNALED(status)) << "the writer failed by itself";
+    return last;
+}
+
+TEST(RegistryCrash, AKilledWriterLeavesWholeFilesAndKeepsEveryReportedWrite) {
+    test::TempFolder folder;
+    std::mt19937 random(std::random_device{}());
+    const std::string user = folder.File(FileRegistry::kCurrentUserFile);
+    const std::string machine = folder.File(FileRegistry::kLocalMachineFile);
+    int32_t next = 0;
+    for (int run = 0; run < 30 && !HasFailure(); ++run) {
+        const int32_t reported = RunAndKill(folder.Path(), next, random);
+        const RegistryKey userRoot = ReadWhole(user);
+        const int32_t counter = DwordAt(userRoot, "Counter");
+        const int32_t state = PatternRound(userRoot);
+        const int32_t round = DwordAt(ReadWhole(machine), "Round");
+        EXPECT_TRUE(counter == reported || counter == reported + 1) << counter << " " << reported;
+        EXPECT_TRUE(state == counter || state == counter - 1) << state << " " << counter;
+        EXPECT_TRUE(round == state || round == state - 1) << round << " " << state;
+        EXPECT_GE(round, reported);
+        next = counter + 1;
+    }
+    for (const auto& entry : std::filesystem::directory_iterator(folder.Path())) {
+        const std::string name = entry.path().filename().string();
+        EXPECT_TRUE(entry.path() == user || entry.path() == machine ||
+                    name.find(".cv-tmp") != std::string::npos)
+            << name;
+    }
+}
+
+TEST(RegistryCrash, TwoWritersOfOneStoreLoseNothingOfEachOther) {
+    test::TempFolder folder;
+    constexpr int32_t kValues = 60;
+    int go[2];
+    ASSERT_EQ(::pipe(go), 0);
+    pid_t children[2];
+    for (const char tag : {'A', 'B'}) {
+        const pid_t child = ::fork();
+        if (child == 0) {
+            ::close(go[1]);
+            char start = 0;
+            FileRegistry registry(folder.Path());
+            bool good = ::read(go[0], &start, 1) == 1;
+            for (int32_t i = 0; i < kValues && good; ++i) {
+                good = Put(registry, kHkeyCurrentUser, tag + std::to_string(i), kRegDword,
+                           DwordBytes(i)) == kErrorSuccess;
+            }
+            ::_exit(good ? 0 : 1);
+        }
+        children[tag - 'A'] = child;
+    }
+    ASSERT_EQ(::write(go[1], "gg", 2), 2);
+    ::close(go[1]);
+    ::close(go[0]);
+    for (const pid_t child : children) {
+        int status = 0;
+        ::waitpid(child, &status, 0);
+        EXPECT_TRUE(WIFEXITED(status) && WEXITSTATUS(status) == 0);
+    }
+    const RegistryKey root = ReadWhole(folder.File(FileRegistry::kCurrentUserFile));
+    for (const char tag : {'A', 'B'}) {
+        for (int32_t i = 0; i < kValues; ++i) {
+            EXPECT_EQ(DwordAt(root, tag + std::to_string(i)), i);
+        }
+    }
+}
+
+}  // namespace
+}  // namespace cv::posix
