@@ -237,13 +237,18 @@ void frmOpcTestClient::FillFields() {
 }
 
 void frmOpcTestClient::chkUseScaling_Click() {
+    if (!RunPendingValidations()) {
+        // The click came with a focus move that was refused: it never happened.
+        chkUseScaling->setChecked(!chkUseScaling->isChecked());
+        return;
+    }
     fraScalingValues->setEnabled(chkUseScaling->isChecked());
     // Written at once as well as when the box is left, so that a change
     // made just before the window is closed is not lost.
     mcTunFile.General().SetScalePVandCO(chkUseScaling->isChecked());
 }
 
-// A button acts only once the field the focus came from has passed its check
+// Buttons act only once the field the focus came from has passed its check
 // (the check may still be waiting when press and release arrive together).
 void frmOpcTestClient::cmdHelp_Click() {
     if (RunPendingValidations()) {

@@ -185,7 +185,7 @@ class frmOpcTestClientTest : public QObject {
         QCOMPARE(Channel().InstMin(), 0.0);
     }
 
-    void aButtonWaitsForThePendingCheck() {
+    void clicksWaitForThePendingCheck() {
         Type("txtEngMax", "0.03");
         // Press and release arrive before the queued check has run.
         QTest::mouseClick(Control("cmdHelp"), Qt::LeftButton);
@@ -194,6 +194,12 @@ class frmOpcTestClientTest : public QObject {
         QCOMPARE(Focused(), QStringLiteral("txtEngMax"));
         QCoreApplication::processEvents();
         QCOMPARE(Messages().size(), size_t{1});
+        // So does the scaling switch, which stays as it was.
+        QTest::mouseClick(Control("chkUseScaling"), Qt::LeftButton);
+        QCOMPARE(Messages().size(), size_t{2});
+        QVERIFY(Control<QCheckBox>("chkUseScaling")->isChecked());
+        QVERIFY(Box("txtEngMax")->isEnabled());
+        QCOMPARE(Focused(), QStringLiteral("txtEngMax"));
     }
 
     void sampleIntervalLimits() {
