@@ -46,7 +46,8 @@ namespace cv::posix {
 //   line up to the next header, comments and blank lines included.
 // - New lines end like the first line of the text that has an end; a text
 //   without one (such as a new file) gets CR LF. A last line that had no end
-//   gets one when a line is added after it.
+//   gets one when a line is added after it. So a new file holds exactly
+//   "[Name]\r\nkey=value\r\n", without a byte order mark.
 // - Names and values that would read back as something else are refused:
 //   line breaks anywhere, a key with "=" or starting with ";" or "[".
 //   Names are stored without blanks around them; values exactly as given.
@@ -55,21 +56,21 @@ class IniDocument {
     // An empty text, as a file that does not exist yet.
     IniDocument() = default;
 
-    static IniDocument Parse(std::string_view text);
+    static IniDocument Parse(std::string_view sText);
     std::string Serialise() const;
 
     // The value of the first entry of key in section; nothing when missing.
-    std::optional<std::string> Value(std::string_view section, std::string_view key) const;
+    std::optional<std::string> Value(std::string_view sSection, std::string_view sKey) const;
 
     // Each returns true when the text changed.
-    bool SetValue(std::string_view section, std::string_view key, std::string_view value);
-    bool EraseKey(std::string_view section, std::string_view key);
-    bool EraseSection(std::string_view section);
+    bool SetValue(std::string_view sSection, std::string_view sKey, std::string_view sValue);
+    bool EraseKey(std::string_view sSection, std::string_view sKey);
+    bool EraseSection(std::string_view sSection);
 
     // Whether a write of these names and value is accepted (see above).
-    static bool IsSectionName(std::string_view section);
-    static bool IsKeyName(std::string_view key);
-    static bool IsValueText(std::string_view value);
+    static bool IsSectionName(std::string_view sSection);
+    static bool IsKeyName(std::string_view sKey);
+    static bool IsValueText(std::string_view sValue);
 
   private:
     enum class LineEnd : uint8_t { None, Lf, CrLf };
@@ -88,19 +89,19 @@ class IniDocument {
         std::unordered_map<std::string, uint32_t> keys;
     };
 
-    void AppendLine(std::string_view text, LineEnd end);
-    void IndexKeys(uint32_t block);
+    void AppendLine(std::string_view sText, LineEnd eEnd);
+    void IndexKeys(uint32_t lBlock);
     void IndexSections();
-    const std::vector<uint32_t>* BlocksOf(std::string_view section) const;
+    const std::vector<uint32_t>* BlocksOf(std::string_view sSection) const;
     void EndLastLine();
-    Line NewLine(std::string text) const;
-    void AppendSection(std::string_view section, std::string_view key, std::string_view value);
+    Line NewLine(std::string sText) const;
+    void AppendSection(std::string_view sSection, std::string_view sKey, std::string_view sValue);
 
-    bool byteOrderMark_ = false;
-    LineEnd newLineEnd_ = LineEnd::CrLf;
-    std::vector<Block> blocks_{Block{}};
+    bool mbByteOrderMark = false;
+    LineEnd meNewLineEnd = LineEnd::CrLf;
+    std::vector<Block> mcBlocks{Block{}};
     // Lower-cased section name -> its blocks, in file order.
-    std::unordered_map<std::string, std::vector<uint32_t>> sections_;
+    std::unordered_map<std::string, std::vector<uint32_t>> mcSections;
 };
 
 }  // namespace cv::posix
