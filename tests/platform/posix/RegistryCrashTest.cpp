@@ -123,7 +123,9 @@ int32_t RunAndKill(const std::string& sFolder, int32_t lFirst, std::mt19937& cRa
 
 TEST(RegistryCrash, AKilledWriterLeavesWholeFilesAndKeepsEveryReportedWrite) {
     test::TempFolder folder;
-    std::mt19937 random(std::random_device{}());
+    const unsigned seed = std::random_device{}();
+    SCOPED_TRACE("seed " + std::to_string(seed));
+    std::mt19937 random(seed);
     const std::string user = folder.File(FileRegistry::kCurrentUserFile);
     const std::string machine = folder.File(FileRegistry::kLocalMachineFile);
     int32_t next = 0;
