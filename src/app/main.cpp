@@ -13,6 +13,8 @@
 
 #include "app/Utility.h"
 #include "app/frmOpcTestClient.h"
+#include "platform/posix/FileProfiles.h"
+#include "platform/posix/FileRegistry.h"
 #include "platform/posix/HostComputerName.h"
 #include "platform/posix/PosixProgramInfo.h"
 #include "platform/qt/HelpWindow.h"
@@ -84,8 +86,11 @@ int main(int argc, char** argv) {
     cv::qtui::HelpWindow help;
     cv::posix::HostComputerName computer;
     cv::qtui::QtEventLoop events;
+    cv::posix::FileRegistry registry;
+    cv::posix::FileProfiles profiles;
     cv::RunSwitches run;
-    cv::Platform platform{dialogs, locale, program, help, computer, events, run};
+    cv::Platform platform{dialogs, locale,   program,  help, computer,
+                          events,  registry, profiles, run};
 
     QuitWhenPainted quitter;
     cv::frmOpcTestClient window(platform);

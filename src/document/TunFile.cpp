@@ -2,6 +2,7 @@
 
 namespace cv {
 
-TunFile::TunFile(Platform& platform) : mcTunerType(platform), mcGeneral(platform) {}
+TunFile::TunFile(Platform& platform)
+    : mcIniFile(platform.profiles), mcTunerType(platform), mcGeneral(platform) {}
 
 }  // namespace cv

@@ -5,6 +5,7 @@
 #include "document/TunFileGeneral.h"
 #include "document/TunerType.h"
 #include "platform/Platform.h"
+#include "stores/IniFile.h"
 
 namespace cv {
 
@@ -26,7 +27,12 @@ class TunFile {
     TunFileGeneral& General() { return mcGeneral; }
     const TunFileGeneral& General() const { return mcGeneral; }
 
+    // The INI store of the tuning file; its file name is the file's path.
+    IniFile& IniFileObject() { return mcIniFile; }
+    const IniFile& IniFileObject() const { return mcIniFile; }
+
   private:
+    IniFile mcIniFile;
     cv::TunerType mcTunerType;
     TunFileGeneral mcGeneral;
 };

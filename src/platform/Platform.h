@@ -8,7 +8,9 @@
 #include "platform/EventLoop.h"
 #include "platform/Help.h"
 #include "platform/Locale.h"
+#include "platform/ProfileApi.h"
 #include "platform/ProgramInfo.h"
+#include "platform/RegistryApi.h"
 
 namespace cv {
 
@@ -35,6 +37,8 @@ struct Platform {
     platform::Help& help;
     platform::ComputerName& computer;
     platform::EventLoop& events;
+    platform::RegistryApi& registry;
+    platform::ProfileApi& profiles;
     RunSwitches& run;
 };
 

@@ -7,12 +7,16 @@
 #include "platform/fake/RecordingHelp.h"
 #include "platform/fake/ScriptedDialogs.h"
 #include "platform/fake/VirtualEventLoop.h"
+#include "platform/posix/FileProfiles.h"
+#include "platform/posix/FileRegistry.h"
+#include "support/TempFolder.h"
 
 namespace cv::test {
 
 // A Platform made of fakes: dialogs that record and answer from a queue, a
 // pinned locale (point decimal unless the test asks for the comma one) and a
-// clock that moves only by hand.
+// clock that moves only by hand. The registry and the profile files are the
+// real ones, kept in a fresh temporary folder that goes with the object.
 struct TestPlatform {
     explicit TestPlatform(fake::FixedLocale localeToUse = fake::FixedLocale::Point())
         : locale(std::move(localeToUse)) {}
@@ -26,8 +30,11 @@ struct TestPlatform {
     fake::RecordingHelp help;
     fake::FixedComputerName computer;
     fake::VirtualEventLoop events;
+    TempFolder folder;
+    posix::FileRegistry registry{folder.Path()};
+    posix::FileProfiles profiles{folder.Path()};
     RunSwitches run;
-    Platform platform{dialogs, locale, program, help, computer, events, run};
+    Platform platform{dialogs, locale, program, help, computer, events, registry, profiles, run};
 };
 
 }  // namespace cv::test
