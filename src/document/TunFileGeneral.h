@@ -10,6 +10,9 @@
 
 namespace cv {
 
+class IniFile;
+class TunerType;
+
 // The settings of a tuning document that belong to no single loop or
 // channel: sample interval, DDE link behaviour and time-out, scaling
 // switches, the controller-mode table and chart options. Writes outside a
@@ -72,11 +75,24 @@ class TunFileGeneral {
     // dropped by the map).
     ModeMapClass FillModeMap() const;
 
+    // The settings in the tuning file's sections "DDE", "TrendOptions" and
+    // "Advanced"; WriteDisabled comes from the shared settings file
+    // "Corvalen.ini". Values outside their allowed set are ignored.
+    void ReadFromDisk(IniFile& cTunFile);
+    // Writes nothing for a tuner kind without faceplate; the scan, scaling
+    // and mode-table keys only for a kind with the full edit screen, then
+    // erasing the numbered mode keys of a longer table the file held.
+    void WriteToDisk(IniFile& cTunFile, cv::TunerType& cTunerType);
+    void WriteTimeoutToDisk(IniFile& cTunFile);
+    void WriteUserSetDisplayRanges(IniFile& cTunFile);
+
     static constexpr int32_t kMinModes = 2;
     static constexpr int32_t kMaxModes = 20;
 
   private:
     bool IsRow(int32_t lIndex) const;
+    void ReadModes(const IniFile& cTunFile);
+    void WriteModes(IniFile& cTunFile);
 
     Platform& mPlatform;
     int32_t mlSIinMSec = 1000;
