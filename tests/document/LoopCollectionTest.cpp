@@ -1,0 +1,163 @@
+#include "document/LoopCollection.h"
+
+#include <gtest/gtest.h>
+
+#include <fstream>
+#include <sstream>
+
+#include "document/TunFile.h"
+#include "support/TestPlatform.h"
+
+namespace cv {
+namespace {
+
+struct LoopsFile {
+    test::TestPlatform tp;
+    TunFile tunFile{tp.platform};
+    LoopCollection loops{tp.platform};
+    std::string path = tp.folder.File("loops.tun");
+
+    explicit LoopsFile(int32_t lKind = 9, const std::string& sText = "") {
+        tunFile.SetTunerType(lKind);
+        tunFile.IniFileObject().SetFileName(path);
+        std::ofstream(path, std::ios::binary) << sText;
+    }
+    std::string Text() const {
+        std::ostringstream text;
+        text << std::ifstream(path, std::ios::binary).rdbuf();
+        return text.str();
+    }
+    void AddLoops(int32_t lCount) {
+        for (int32_t k = 0; k < lCount; ++k) {
+            bool bFailed = true;
+            ASSERT_NE(loops.Add(0, bFailed), nullptr);
+            ASSERT_FALSE(bFailed);
+        }
+    }
+};
+
+TEST(LoopCollection, RemoveRenumbersAndLowersTheCurrentLoop) {
+    LoopsFile f;
+    EXPECT_EQ(f.loops.CurrentLoop(), 0);
+    f.AddLoops(3);
+    EXPECT_EQ(f.loops.CurrentLoop(), 1);
+    f.loops.Item(3)->SetPVChannel(7);
+    f.loops.SetCurrentLoop(3);
+    f.loops.SetCurrentLoop(5);
+    EXPECT_EQ(f.loops.CurrentLoop(), 3);
+
+    LoopClass* second = f.loops.Item(2);
+    f.loops.Remove(second);
+    EXPECT_EQ(second, nullptr);
+    EXPECT_EQ(f.loops.Count(), 2);
+    EXPECT_EQ(f.loops.CurrentLoop(), 2);
+    EXPECT_EQ(f.loops.PVChannelNumber(2), 7);
+    EXPECT_EQ(f.loops.Item(3), nullptr);
+    EXPECT_EQ(f.loops.SPChannelNumber(3), 0);
+
+    LoopClass stranger(f.tp.platform);
+    stranger.SetNumber(9);
+    LoopClass* pStranger = &stranger;
+    f.loops.Remove(pStranger);
+    EXPECT_EQ(pStranger, &stranger);
+    EXPECT_EQ(f.loops.Count(), 2);
+
+    f.loops.SetCurrentLoop(0);
+    EXPECT_EQ(f.loops.CurrentLoop(), 0);
+    LoopClass* first = f.loops.Item(1);
+    f.loops.Remove(first);
+    first = f.loops.Item(1);
+    f.loops.Remove(first);
+    EXPECT_EQ(f.loops.Count(), 0);
+    EXPECT_EQ(f.loops.CurrentLoop(), 0);
+}
+
+TEST(LoopCollection, DefaultsAndCopy) {
+    LoopsFile f;
+    f.loops.SetDefaults();
+    f.AddLoops(1);
+    f.loops.Item(2)->SetDescription("Second");
+    f.loops.Item(2)->SetControl(3);
+    f.loops.SetCurrentLoop(2);
+    EXPECT_EQ(f.loops.Item(1)->Description(), "Faceplate");
+
+    std::unique_ptr<LoopCollection> copy = f.loops.Copy();
+    ASSERT_EQ(copy->Count(), 2);
+    EXPECT_EQ(copy->CurrentLoop(), 2);
+    EXPECT_EQ(copy->Item(2)->Number(), 2);
+    EXPECT_EQ(copy->Item(2)->Description(), "Second");
+    EXPECT_EQ(copy->Item(2)->Control(), 1);
+    copy->Item(1)->SetDescription("Changed");
+    EXPECT_EQ(f.loops.Item(1)->Description(), "Faceplate");
+}
+
+TEST(LoopCollection, LoopCountComesFromTheFileAndTheKind) {
+    LoopsFile faceplate(9, "[ArchiveTuner]\n");
+    faceplate.loops.ReadFromDisk(faceplate.tunFile);
+    ASSERT_EQ(faceplate.loops.Count(), 1);
+    EXPECT_EQ(faceplate.loops.Item(1)->Description(), "Faceplate");
+    EXPECT_EQ(faceplate.loops.CurrentLoop(), 1);
+
+    LoopsFile archive(5, "[ArchiveTuner]\nNumberOfLoops=-4\n");
+    archive.loops.ReadFromDisk(archive.tunFile);
+    EXPECT_EQ(archive.loops.Count(), 0);
+    EXPECT_EQ(archive.loops.CurrentLoop(), 0);
+
+    LoopsFile three(9,
+                    "[ArchiveTuner]\nNumberOfLoops=3\n[PIDController Loop 3]\nSPChannel=6\n"
+                    "Description=Drum level\n");
+    three.loops.ReadFromDisk(three.tunFile);
+    ASSERT_EQ(three.loops.Count(), 3);
+    EXPECT_EQ(three.loops.SPChannelNumber(1), 3);
+    EXPECT_EQ(three.loops.SPChannelNumber(2), 0);
+    EXPECT_EQ(three.loops.SPChannelNumber(3), 6);
+    EXPECT_EQ(three.loops.Item(3)->Description(), "Drum level");
+    EXPECT_TRUE(three.tp.dialogs.Messages().empty());
+}
+
+TEST(LoopCollection, WildLoopCountsAreBounded) {
+    for (const char* stored : {"2000000000", "99999999999999999999"}) {
+        LoopsFile f(5, std::string("[ArchiveTuner]\nNumberOfLoops=") + stored + "\n");
+        f.loops.ReadFromDisk(f.tunFile);
+        EXPECT_EQ(f.loops.Count(), LoopCollection::kMaxLoops) << stored;
+        EXPECT_EQ(f.loops.Item(LoopCollection::kMaxLoops)->Number(), LoopCollection::kMaxLoops);
+    }
+
+    LoopsFile f(5, "[ArchiveTuner]\nNumberOfLoops=2000000000\n[PIDController Loop 3]\nx=1\n");
+    f.AddLoops(2);
+    f.loops.WriteToDisk(f.tunFile);
+    EXPECT_EQ(f.tunFile.IniFileObject().ReadLong("ArchiveTuner", "NumberOfLoops", 0, 0, 0), 2);
+    EXPECT_EQ(f.Text().find("[PIDController Loop 3]"), std::string::npos);
+}
+
+TEST(LoopCollection, WritingFewerLoopsErasesTheirSections) {
+    std::string text = "[ArchiveTuner]\nNumberOfLoops=4\n";
+    for (int k = 1; k <= 5; ++k) {
+        text += "[PIDController Loop " + std::to_string(k) + "]\nDescription=Old\n";
+    }
+    LoopsFile f(9, text);
+    f.AddLoops(2);
+    f.loops.Item(2)->SetDescription("Kept");
+    f.loops.WriteToDisk(f.tunFile);
+    const std::string written = f.Text();
+    EXPECT_NE(written.find("NumberOfLoops=2"), std::string::npos) << written;
+    EXPECT_NE(written.find("Description=Kept"), std::string::npos) << written;
+    EXPECT_EQ(written.find("[PIDController Loop 3]"), std::string::npos) << written;
+    EXPECT_EQ(written.find("[PIDController Loop 4]"), std::string::npos) << written;
+    EXPECT_NE(written.find("[PIDController Loop 5]"), std::string::npos) << written;
+
+    LoopCollection back(f.tp.platform);
+    back.ReadFromDisk(f.tunFile);
+    ASSERT_EQ(back.Count(), 2);
+    EXPECT_EQ(back.Item(2)->Description(), "Kept");
+}
+
+TEST(LoopCollection, SameCountLeavesTheKeyUntouched) {
+    LoopsFile f(9, "[ArchiveTuner]\nNumberOfLoops=02\n");
+    f.AddLoops(2);
+    f.loops.WriteToDisk(f.tunFile);
+    EXPECT_NE(f.Text().find("NumberOfLoops=02"), std::string::npos) << f.Text();
+}
+
+}  // namespace
+}  // namespace cv
