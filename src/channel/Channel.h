@@ -9,7 +9,9 @@
 
 namespace cv {
 
+class IniFile;
 class TunFile;
+class TunerType;
 
 // The three ranges a channel keeps; their names appear in messages.
 enum class RangeType : int32_t { Engineering = 0, Instrument = 1, Display = 2 };
@@ -106,6 +108,21 @@ class Channel {
     std::string OpcNodeAndServer() const;
     void SetOpcNodeAndServer(const std::string& sNodeAndServer);
 
+    // Persistence in the tuning file (cIni) and the shared "Corvalen.ini"
+    // (cSharedIni). A loop-specific channel (SpecificChannelType 1 to 12)
+    // keeps its item under one section per protocol; an archive channel
+    // (SpecificChannelType 0) has the section "Channel" + Number.
+    void ReadCorvalentIni(IniFile& cSharedIni, std::string& sRoleName, int32_t& lColour);
+    void ReadFromDisk(IniFile& cSharedIni, TunFile& cTunFile);
+    void WriteToDisk(IniFile& cSharedIni, IniFile& cIni, cv::TunerType& cTuner);
+    void WriteSpansToDisk(const std::string& sSection, IniFile& cIni, cv::TunerType& cTuner);
+    void WriteDisplayDataToDisk(const std::string& sSection, IniFile& cSharedIni, IniFile& cIni,
+                                cv::TunerType& cTuner);
+    void WriteEngUnitsToDisk(IniFile& cIni, const std::string& sSection);
+    // Ranges, display attributes and address; not the number, nor anything
+    // of the communications.
+    void CopyFrom(const Channel& cSource);
+
     // Communications.
     int32_t ComType() const { return miComType; }
     void SetComType(int32_t lComType) { miComType = lComType; }
@@ -144,6 +161,19 @@ class Channel {
                                std::string& sQuestion, const ErrorInfo& currentError);
 
   private:
+    std::string RoleName() const;
+    std::string ChannelSection() const;
+    bool IsSpOfFaceplate(cv::TunerType& cTuner) const;
+    void ReadSpecificFromDisk(IniFile& cIni, int32_t lTuner);
+    void ReadArchiveFromDisk(IniFile& cSharedIni, IniFile& cIni, cv::TunerType& cTuner);
+    void ReadArchiveDisplay(IniFile& cSharedIni, IniFile& cIni, cv::TunerType& cTuner);
+    void ReadArchiveAddress(IniFile& cIni, int32_t lTuner);
+    void ReadArchiveDdeAddress(IniFile& cIni, int32_t lTuner);
+    void ReadArchiveOpcAddress(IniFile& cIni);
+    void WriteSpecificToDisk(IniFile& cIni, int32_t lTuner);
+    void WriteArchiveAddress(IniFile& cIni, int32_t lTuner);
+    void WriteArchiveDdeAddress(IniFile& cIni);
+    void WriteArchiveOpcAddress(IniFile& cIni);
     void CalcScaleFactors();
     void UpdateScalingFlags(TunFile& cTunFile);
     ErrorInfo ScaledRawValue(const Variant& vRaw, double& dValue) const;
