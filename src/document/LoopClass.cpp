@@ -10,8 +10,6 @@ namespace cv {
 
 namespace {
 
-constexpr std::array<const char*, 4> kFilterUnitNames = {"Same As D", "Seconds", "Minutes",
-                                                         "Hertz"};
 constexpr const char* kOrsiPrefix = "Orsi LOOP ";
 
 // The text for code lCode among codes 1 to N, else sOther.

@@ -1,5 +1,6 @@
 #pragma once
 
+#include <array>
 #include <cstdint>
 #include <string>
 
@@ -16,6 +17,10 @@ class TunFile;
 // allowed set are ignored and the old value stays.
 class LoopClass {
   public:
+    // The filter-unit names by code, 0 to 3.
+    static constexpr std::array<const char*, 4> kFilterUnitNames = {"Same As D", "Seconds",
+                                                                    "Minutes", "Hertz"};
+
     // The controller string of a new loop is the default controller of this
     // program's own tuner kind.
     explicit LoopClass(Platform& platform);
