@@ -201,39 +201,25 @@ void frmOpcTestClient::Load() {
     // The document of this program's tuner kind; the channel under test is
     // its SP channel, an OPC channel numbered 3.
     mcTunFile.SetTunerType(ProgramTunerKind());
-    mcChannel.SetNumber(3);
-    mcChannel.SetComType(ComTypeCode::Opc);
+    TestChannel().SetNumber(3);
+    TestChannel().SetComType(ComTypeCode::Opc);
 
-    ApplyRememberedValues();
+    ReadRememberedValues();
     FillFields();
 }
 
-void frmOpcTestClient::ApplyRememberedValues() {
-    // The eleven remembered values, applied in the order in which they are
-    // stored; these are the values of a first run.
-    mcChannel.SetOpcNodeAndServer("");
-    mcChannel.SetOpcAccessPath("");
-    mcChannel.SetItemName("");
-    mcChannel.SetRange(RangeType::Engineering, 0, 100);
-    mcChannel.SetRange(RangeType::Instrument, 0, 100);
-    mcChannel.SetDecimalPlaces(2);
-    mcChannel.SetLineColor(65280);
-    mcTunFile.General().SetScalePVandCO(true);
-    mcTunFile.General().SetSIinSec(1.0);
-}
-
 void frmOpcTestClient::FillFields() {
-    txtServerID->setText(QString::fromStdString(mcChannel.OpcNodeAndServer()));
-    txtAccessPath->setText(QString::fromStdString(mcChannel.OpcAccessPath()));
-    txtItemID->setText(QString::fromStdString(mcChannel.ItemName()));
-    txtEngMin->setText(QString::fromStdString(RangeText(mcChannel.EngMin())));
-    txtEngMax->setText(QString::fromStdString(RangeText(mcChannel.EngMax())));
-    txtInstMin->setText(QString::fromStdString(RangeText(mcChannel.InstMin())));
-    txtInstMax->setText(QString::fromStdString(RangeText(mcChannel.InstMax())));
-    chkUseScaling->setChecked(mcTunFile.General().ScalePVandCO());
+    const Channel& channel = TestChannel();
+    txtServerID->setText(QString::fromStdString(channel.OpcNodeAndServer()));
+    txtAccessPath->setText(QString::fromStdString(channel.OpcAccessPath()));
+    txtItemID->setText(QString::fromStdString(channel.ItemName()));
+    txtEngMin->setText(QString::fromStdString(RangeText(channel.EngMin())));
+    txtEngMax->setText(QString::fromStdString(RangeText(channel.EngMax())));
+    txtInstMin->setText(QString::fromStdString(RangeText(channel.InstMin())));
+    txtInstMax->setText(QString::fromStdString(RangeText(channel.InstMax())));
+    chkUseScaling->setChecked(General().ScalePVandCO());
     chkUseScaling_Click();
-    txtSI->setText(
-        QString::fromStdString(FormatFloat(mPlatform.locale, mcTunFile.General().SIinSec(), 4)));
+    txtSI->setText(QString::fromStdString(FormatFloat(mPlatform.locale, General().SIinSec(), 4)));
 }
 
 void frmOpcTestClient::chkUseScaling_Click() {
@@ -245,7 +231,7 @@ void frmOpcTestClient::chkUseScaling_Click() {
     fraScalingValues->setEnabled(chkUseScaling->isChecked());
     // Written at once as well as when the box is left, so that a change
     // made just before the window is closed is not lost.
-    mcTunFile.General().SetScalePVandCO(chkUseScaling->isChecked());
+    General().SetScalePVandCO(chkUseScaling->isChecked());
 }
 
 // Buttons act only once the field the focus came from has passed its check

@@ -45,7 +45,6 @@ class frmOpcTestClient : public QWidget {
     void SetTabOrder();
     void WatchFields();
     void Load();
-    void ApplyRememberedValues();
     void FillFields();
     void chkUseScaling_Click();
     void cmdHelp_Click();
@@ -60,6 +59,14 @@ class frmOpcTestClient : public QWidget {
     bool CheckMinMax(double dMin, double dMax, const std::string& sSpanName);
     bool ValidateSI();
     std::string RangeText(double dValue) const;
+
+    // The remembered values (frmOpcTestClient_settings.cpp).
+    void ReadRememberedValues();
+    void ApplyRememberedRange(RangeType eRange, double dMin, double dMax);
+    void WriteRememberedValues();
+
+    // The document's general settings: the scaling switch and the sample interval.
+    TunFileGeneral& General() { return mcTunFile.General(); }
 
     Platform& mPlatform;
     TunFile mcTunFile;

@@ -65,13 +65,15 @@ bool frmOpcTestClient::RunPendingValidations() {
 
 void frmOpcTestClient::closeEvent(QCloseEvent* event) {
     // A focus move made just before closing is still checked; the window
-    // closes either way, as closing never checks the field that has the focus.
+    // closes either way, as closing never checks the field that has the
+    // focus. Then the values the objects hold are remembered.
     RunPendingValidations();
+    WriteRememberedValues();
     QWidget::closeEvent(event);
 }
 
 bool frmOpcTestClient::Validate(QWidget* field) {
-    Channel& channel = mcChannel;
+    Channel& channel = TestChannel();
     if (field == txtServerID) {
         channel.SetOpcNodeAndServer(TrimmedText(*txtServerID));
     } else if (field == txtAccessPath) {
@@ -79,7 +81,7 @@ bool frmOpcTestClient::Validate(QWidget* field) {
     } else if (field == txtItemID) {
         channel.SetItemName(TrimmedText(*txtItemID));
     } else if (field == chkUseScaling) {
-        mcTunFile.General().SetScalePVandCO(chkUseScaling->isChecked());
+        General().SetScalePVandCO(chkUseScaling->isChecked());
     } else if (field == txtEngMin) {
         return ValidateRangeBox(*txtEngMin, "Eng span", RangeType::Engineering, false,
                                 channel.EngMax());
@@ -103,13 +105,13 @@ bool frmOpcTestClient::ValidateRangeBox(QLineEdit& box, const std::string& sSpan
     const float v = TextToSingle(mPlatform, box.text().toStdString());
     // The box shows single-precision numbers, so the held limit is compared
     // at that precision.
-    if (v == static_cast<float>(mcChannel.GetRangeValue(eRange, bIsMax ? 1 : 0))) {
+    if (v == static_cast<float>(TestChannel().GetRangeValue(eRange, bIsMax ? 1 : 0))) {
         return true;
     }
     const double dMin = bIsMax ? dOtherLimit : v;
     const double dMax = bIsMax ? v : dOtherLimit;
     if (CheckMinMax(dMin, dMax, sSpanName)) {
-        mcChannel.SetRange(eRange, dMin, dMax);
+        TestChannel().SetRange(eRange, dMin, dMax);
         return true;
     }
     box.setText(QString::fromStdString(RangeText(v)));
@@ -131,7 +133,7 @@ bool frmOpcTestClient::CheckMinMax(double dMin, double dMax, const std::string& 
 }
 
 bool frmOpcTestClient::ValidateSI() {
-    TunFileGeneral& general = mcTunFile.General();
+    TunFileGeneral& general = General();
     if (TrimmedText(*txtSI) == FormatFloat(mPlatform.locale, general.SIinSec(), 4)) {
         return true;
     }
