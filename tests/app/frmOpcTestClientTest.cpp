@@ -3,11 +3,15 @@
 #include <QLabel>
 #include <QLineEdit>
 #include <QPushButton>
+#include <QWindow>
 #include <QtTest>
+#include <filesystem>
+#include <fstream>
 #include <memory>
 
 #include "app/Utility.h"
 #include "app/frmOpcTestClient.h"
+#include "stores/RegClass.h"
 #include "support/TestPlatform.h"
 
 using cv::frmOpcTestClient;
@@ -17,6 +21,8 @@ namespace {
 
 const std::string kEngTooClose = "Eng span Min must be more than .05 from Max.";
 const std::string kSIRange = "Must be less than 61 and greater or equal to .1";
+const std::string kKey = "Software\\Corvalent\\TestClient";
+const QStringList kFirstRunBoxes = {"", "", "", "0", "100", "0", "100", "1"};
 
 }  // namespace
 
@@ -58,14 +64,35 @@ class frmOpcTestClientTest : public QObject {
     QString Focused() {
         return QApplication::focusWidget() ? QApplication::focusWidget()->objectName() : QString();
     }
-
-  private slots:
-    void init() {
-        tp = std::make_unique<cv::test::TestPlatform>();
+    // The program's next run on the same settings folder.
+    void Open() {
         window = std::make_unique<frmOpcTestClient>(tp->platform);
         window->show();
         window->activateWindow();
         QVERIFY(QTest::qWaitForWindowActive(window.get()));
+    }
+    QStringList Boxes() {
+        QStringList texts;
+        for (const char* name : {"txtServerID", "txtAccessPath", "txtItemID", "txtEngMin",
+                                 "txtEngMax", "txtInstMin", "txtInstMax", "txtSI"}) {
+            texts << Box(name)->text();
+        }
+        return texts;
+    }
+    // The user's settings as another program reading the folder finds them.
+    cv::RegClass Settings(cv::platform::RegistryApi& cRegistry) {
+        cv::RegClass cReg(cRegistry);
+        cReg.SetMainKey(cv::platform::kHkeyCurrentUser);
+        return cReg;
+    }
+    std::string RegistryFile() {
+        return tp->folder.File(cv::posix::FileRegistry::kCurrentUserFile);
+    }
+
+  private slots:
+    void init() {
+        tp = std::make_unique<cv::test::TestPlatform>();
+        Open();
     }
     void cleanup() {
         window.reset();
@@ -295,6 +322,89 @@ class frmOpcTestClientTest : public QObject {
         QVERIFY(window->close());
         QVERIFY(Messages().empty());
         QCOMPARE(Channel().EngMax(), 100.0);
+    }
+
+    void valuesAreRememberedBetweenRuns() {
+        Enter("txtServerID", "\\\\PLANT7\\Vendor.Server.1");
+        Enter("txtItemID", "Area1.FIC101.PV");
+        Enter("txtEngMin", "-50");
+        Enter("txtInstMin", "0.1");
+        Enter("txtInstMax", "20");
+        Enter("txtSI", "2.5");
+        QTest::mouseClick(Control("chkUseScaling"), Qt::LeftButton);
+        Channel().SetDecimalPlaces(4);
+        Channel().SetLineColor(255);
+        const QStringList shown = Boxes();
+        QTest::mouseClick(Control("cmdClose"), Qt::LeftButton);
+
+        cv::posix::FileRegistry disk(tp->folder.Path());
+        QCOMPARE(Settings(disk).ReadDouble(kKey, "InstMin", 0), double(0.1F));
+        QCOMPARE(Settings(disk).ReadString(kKey, "Scaling", ""), std::string("0"));
+        QCOMPARE(Settings(disk).ReadLong(kKey, "DecPt", 0, 0, 0), 4);
+        Open();
+        QCOMPARE(Boxes(), shown);
+        QVERIFY(!Control<QCheckBox>("chkUseScaling")->isChecked());
+        QVERIFY(!Control("fraScalingValues")->isEnabled());
+        QCOMPARE(Channel().OpcComputer(), std::string("PLANT7"));
+        QCOMPARE(Channel().LineColor(), 255);
+        QCOMPARE(window->Document().General().SIinMSec(), 2500);
+
+        // Closed from the title bar: a checked field is saved, a typed one is not.
+        Enter("txtItemID", "Area1.FIC101.SP");
+        Type("txtAccessPath", "NotChecked");
+        window->windowHandle()->close();
+        QVERIFY(!window->isVisible());
+        cv::posix::FileRegistry after(tp->folder.Path());
+        QCOMPARE(Settings(after).ReadString(kKey, "ItemName", ""), std::string("Area1.FIC101.SP"));
+        QCOMPARE(Settings(after).ReadString(kKey, "AccessPath", "?"), std::string());
+    }
+
+    void handEditedValuesPassTheObjectsRules() {
+        window.reset();
+        cv::RegClass hand = Settings(tp->registry);
+        hand.WriteString(kKey, "ServerID", std::string(300, 'x'));
+        hand.WriteLong(kKey, "AccessPath", 7);
+        hand.WriteString(kKey, "EngMin", "-1e400");
+        hand.WriteString(kKey, "EngMax", "1e400");
+        hand.WriteString(kKey, "InstMin", "4");
+        hand.WriteString(kKey, "InstMax", "4.0000000001");
+        hand.WriteLong(kKey, "DecPt", 6);
+        hand.WriteLong(kKey, "Colour", -1);
+        hand.WriteString(kKey, "Scaling", "yes");
+        hand.WriteString(kKey, "SI", "0.01");
+        Open();
+        QCOMPARE(Boxes(), kFirstRunBoxes);
+        QCOMPARE(Channel().ScaleFactor(), 1.0);
+        QCOMPARE(Channel().DecimalPlaces(), 2);
+        QCOMPARE(Channel().LineColor(), 65280);
+        QVERIFY(Control<QCheckBox>("chkUseScaling")->isChecked());
+        QVERIFY(Messages().empty());
+
+        // The channel allows an inverted range, the settings a 20 ms interval.
+        window.reset();
+        hand.WriteString(kKey, "EngMin", "100");
+        hand.WriteString(kKey, "EngMax", "0");
+        hand.WriteString(kKey, "SI", ".02");
+        Open();
+        QCOMPARE(Channel().ScaleFactor(), -1.0);
+        QCOMPARE(window->Document().General().SIinMSec(), 20);
+    }
+
+    void aBrokenRegistryFileGivesTheDefaultsSilently() {
+        window.reset();
+        std::ofstream(RegistryFile()) << "not a registry\n[Software\n\"EngMax\"=7\n";
+        Open();
+        QCOMPARE(Boxes(), kFirstRunBoxes);
+        // A file that cannot be read: not read, and not replaced on closing.
+        window.reset();
+        std::filesystem::remove(RegistryFile());
+        std::filesystem::create_directory(RegistryFile());
+        Open();
+        QCOMPARE(Boxes(), kFirstRunBoxes);
+        Enter("txtItemID", "A.B");
+        QVERIFY(window->close());
+        QVERIFY(std::filesystem::is_directory(RegistryFile()));
+        QVERIFY(Messages().empty());
     }
 };
 
