@@ -185,15 +185,5 @@ TEST(TunFileGeneralDisk, KindDecidesWhatIsWritten) {
     EXPECT_TRUE(f.tp.dialogs.Messages().empty());
 }
 
-TEST(TunFileGeneralDisk, SingleKeyWritersTouchOnlyTheirKey) {
-    GeneralFile f;
-    f.general.SetDDETimeout(49);
-    f.general.WriteTimeoutToDisk(f.ini);
-    EXPECT_EQ(ReadText(f.path), "[DDE]\r\nDDE_Timeout=50\r\n");
-    WriteText(f.path, "");
-    f.general.WriteUserSetDisplayRanges(f.ini);
-    EXPECT_EQ(ReadText(f.path), "[TrendOptions]\r\nUserSetDisplayRanges=0\r\n");
-}
-
 }  // namespace
 }  // namespace cv
