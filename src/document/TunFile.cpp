@@ -1,8 +1,105 @@
 #include "document/TunFile.h"
 
+#include "app/Utility.h"
+#include "document/CorvalentIni.h"
+
 namespace cv {
 
 TunFile::TunFile(Platform& platform)
-    : mcIniFile(platform.profiles), mcTunerType(platform), mcGeneral(platform) {}
+    : mPlatform(platform),
+      mcArchives(std::make_unique<ArchiveChannels>(platform)),
+      mcSpecifics(std::make_unique<SpecificChannels>(platform)),
+      mcLoops(std::make_unique<LoopCollection>(platform)),
+      mcIniFile(platform.profiles),
+      mcTunerType(platform),
+      mcGeneral(platform) {}
+
+TunFile::~TunFile() = default;
+
+void TunFile::SetDefaults(int32_t lTuner) {
+    mcTunerType.SetTuner(lTuner);
+    mcArchives->SetDefaults(*this);
+    mcSpecifics->SetDefaults(*this);
+    if (mcTunerType.HasFaceplate()) {
+        CopyFaceplateRanges();
+    }
+    mcLoops->SetDefaults();
+    mcIniFile.SetFileName(DefaultPath());
+}
+
+bool TunFile::ReadFromDisk(int32_t lTuner, const std::string& sPath) {
+    if (!mcIniFile.FileName().empty()) {
+        ShowError("Error: TunFile.ReadFromDisk(1)");
+        return false;
+    }
+    if (sPath.empty()) {
+        ShowError("Error: TunFile.ReadFromDisk(2)");
+        return false;
+    }
+    mcTunerType.SetTuner(lTuner);
+    mcIniFile.SetFileName(sPath);
+    ConvertFileFormat();
+    mcGeneral.ReadFromDisk(mcIniFile);
+    mcArchives->ReadFromDisk(*this);
+    mcSpecifics->ReadFromDisk(*this);
+    if (mcTunerType.HasFaceplate()) {
+        CopyFaceplateRanges();
+    }
+    mcLoops->ReadFromDisk(*this);
+    return true;
+}
+
+bool TunFile::WriteToDisk(const std::string& sPath) {
+    if (sPath.empty()) {
+        ShowError("Error: TunFile.WriteToDisk");
+        return false;
+    }
+    std::string sFormerPath = mcIniFile.FileName();
+    mcIniFile.SetFileName(sPath);
+    IniFile cShared = CorvalentIni(mPlatform);
+    IniFile::Batch cSharedBatch(cShared);
+    IniFile::Batch cBatch(mcIniFile);
+    mcGeneral.WriteToDisk(mcIniFile, mcTunerType);
+    mcArchives->WriteToDisk(mcIniFile, mcTunerType);
+    if (mcTunerType.HasFaceplate()) {
+        mcSpecifics->WriteToDisk(*this);
+    }
+    mcLoops->WriteToDisk(*this);
+    cSharedBatch.End();
+    if (!cBatch.End()) {
+        mcIniFile.SetFileName(std::move(sFormerPath));
+        ShowError("Error: TunFile.WriteToDisk");
+        return false;
+    }
+    return true;
+}
+
+void TunFile::SetArchives(std::unique_ptr<ArchiveChannels> cArchives) {
+    if (cArchives != nullptr) {
+        mcArchives = std::move(cArchives);
+    }
+}
+
+void TunFile::SetLoops(std::unique_ptr<LoopCollection> cLoops) {
+    if (cLoops != nullptr) {
+        mcLoops = std::move(cLoops);
+    }
+}
+
+// Faceplate kinds send CO and SP in the ranges of the charted CO and PV.
+void TunFile::CopyFaceplateRanges() {
+    Channel* cSendCO = mcSpecifics->Item(SpecificType::SendCO);
+    Channel* cSendSP = mcSpecifics->Item(SpecificType::SendSP);
+    if (cSendCO != nullptr && mcArchives->COChannel() != nullptr) {
+        cSendCO->CopyRangeValuesFrom(*mcArchives->COChannel());
+    }
+    if (cSendSP != nullptr && mcArchives->PVChannel() != nullptr) {
+        cSendSP->CopyRangeValuesFrom(*mcArchives->PVChannel());
+    }
+}
+
+void TunFile::ShowError(const std::string& sText) {
+    mPlatform.dialogs.MsgBox(sText, MsgBoxStyle::OKOnly, "");
+}
 
 }  // namespace cv

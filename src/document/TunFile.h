@@ -1,7 +1,14 @@
 #pragma once
 
 #include <cstdint>
+#include <memory>
+#include <string>
 
+#include "channel/Channel.h"
+#include "document/ArchiveChannels.h"
+#include "document/LoopCollection.h"
+#include "document/ModeMapClass.h"
+#include "document/SpecificChannels.h"
 #include "document/TunFileGeneral.h"
 #include "document/TunerType.h"
 #include "platform/Platform.h"
@@ -9,14 +16,59 @@
 
 namespace cv {
 
-// The tuning document: owns the tuner kind and the general settings, and is
-// the hub every collection and channel receives by reference. It is neither
-// copied nor moved, since its parts keep references to it.
+// The tuning document: owns the charted channels, the loop-specific
+// channels, the loops, the INI store of its tuning file, the tuner kind, the
+// general settings and the controller mode map, and is the hub every
+// collection and channel receives by reference. It is neither copied nor
+// moved, since its parts keep references to it.
+//
+// A default document's file is "LoopTag.tun" in the program's folder, or,
+// when that folder cannot be written, in the program's data folder
+// (ProgramInfo::DataFolder) under the same name.
 class TunFile {
   public:
+    static constexpr const char* kDefaultFileName = "LoopTag.tun";
+
     explicit TunFile(Platform& platform);
+    ~TunFile();
     TunFile(const TunFile&) = delete;
     TunFile& operator=(const TunFile&) = delete;
+
+    // Builds PV, CO and SP, specific channels 1 to 10 and one loop, and
+    // names the default file.
+    void SetDefaults(int32_t lTuner);
+    // Reads a tuning file into a fresh document; a document that already has
+    // a file name, or an empty path, is refused with a message.
+    bool ReadFromDisk(int32_t lTuner, const std::string& sPath);
+    // Writes the document to sPath as one replacement of the file (and one
+    // of the shared settings file): other programs see all of the save or
+    // none of it. False, with a message and the old file name kept, when the
+    // path is empty or the file could not be stored.
+    bool WriteToDisk(const std::string& sPath);
+    // Upgrades keys that files of version 12.07.99 and before held in an
+    // older form.
+    void ConvertFileFormat();
+
+    // The file name without folder and last extension; setting it cuts the
+    // tag at its last "." and names "<tag>.tun" in the current folder.
+    std::string LoopTag() const;
+    void SetLoopTag(const std::string& sTag);
+    const std::string& TunFilePath() const { return mcIniFile.FileName(); }
+
+    ArchiveChannels& Archives() { return *mcArchives; }
+    const ArchiveChannels& Archives() const { return *mcArchives; }
+    // A null collection is ignored: the document always has one.
+    void SetArchives(std::unique_ptr<ArchiveChannels> cArchives);
+    SpecificChannels& Specifics() { return *mcSpecifics; }
+    const SpecificChannels& Specifics() const { return *mcSpecifics; }
+    LoopCollection& Loops() { return *mcLoops; }
+    const LoopCollection& Loops() const { return *mcLoops; }
+    // A null collection is ignored: the document always has one.
+    void SetLoops(std::unique_ptr<LoopCollection> cLoops);
+
+    // The INI store of the tuning file; its file name is the file's path.
+    IniFile& IniFileObject() { return mcIniFile; }
+    const IniFile& IniFileObject() const { return mcIniFile; }
 
     // The tuner-kind code, forwarded to the tuner kind.
     int32_t TunerType() const { return mcTunerType.Tuner(); }
@@ -26,15 +78,42 @@ class TunFile {
 
     TunFileGeneral& General() { return mcGeneral; }
     const TunFileGeneral& General() const { return mcGeneral; }
+    // Created empty; filled by the callers through its own operations.
+    ModeMapClass& ModeMap() { return mcModeMap; }
+    const ModeMapClass& ModeMap() const { return mcModeMap; }
 
-    // The INI store of the tuning file; its file name is the file's path.
-    IniFile& IniFileObject() { return mcIniFile; }
-    const IniFile& IniFileObject() const { return mcIniFile; }
+    LoopClass* FaceplateLoop() { return mcLoops->Item(1); }
+    LoopClass* CurrentLoop() { return mcLoops->Item(mcLoops->CurrentLoop()); }
+    // The current loop's channel numbers; 0 when beyond the archive count.
+    int32_t CurrentPVChannel() const;
+    int32_t CurrentCOChannel() const;
+    int32_t CurrentSPChannel() const;
+    // The archive channels of those numbers; nullptr below 1.
+    Channel* CurrentPVChannelObj() const;
+    Channel* CurrentCOChannelObj() const;
+    Channel* CurrentSPChannelObj() const;
+
+    // The controller's mode in words from the mode map, while the mode
+    // channel has data; "Unknown" otherwise.
+    std::string ModeValue();
+    bool IsValid() const { return mcArchives->Count() >= 1; }
+    bool IsSimulation() const { return false; }
 
   private:
+    int32_t ArchiveNumber(int32_t lNumber) const;
+    Channel* ArchiveObj(int32_t lNumber) const;
+    void CopyFaceplateRanges();
+    std::string DefaultPath() const;
+    void ShowError(const std::string& sText);
+
+    Platform& mPlatform;
+    std::unique_ptr<ArchiveChannels> mcArchives;
+    std::unique_ptr<SpecificChannels> mcSpecifics;
+    std::unique_ptr<LoopCollection> mcLoops;
     IniFile mcIniFile;
     cv::TunerType mcTunerType;
     TunFileGeneral mcGeneral;
+    ModeMapClass mcModeMap;
 };
 
 }  // namespace cv

@@ -2,10 +2,25 @@
 
 #include <gtest/gtest.h>
 
+#include <filesystem>
+#include <fstream>
+
 #include "support/TestPlatform.h"
 
 namespace cv {
 namespace {
+
+// A document whose program folder is a writable temporary one.
+struct Fixture {
+    Fixture() : document(tp.platform) {
+        tp.program.folder = programFolder.Path();
+        tp.program.dataFolder = dataFolder.Path();
+    }
+    test::TestPlatform tp;
+    test::TempFolder programFolder;
+    test::TempFolder dataFolder;
+    TunFile document;
+};
 
 TEST(TunFile, ForwardsTheTunerKindAndKeepsItsSettings) {
     test::TestPlatform tp;
@@ -18,6 +33,204 @@ TEST(TunFile, ForwardsTheTunerKindAndKeepsItsSettings) {
     tunFile.General().SetSIinSec(2.5);
     EXPECT_EQ(tunFile.General().SIinMSec(), 2500);
     EXPECT_TRUE(tp.dialogs.Messages().empty());
+}
+
+TEST(TunFile, NewDocumentIsEmpty) {
+    test::TestPlatform tp;
+    TunFile document(tp.platform);
+    EXPECT_FALSE(document.IsValid());
+    EXPECT_FALSE(document.IsSimulation());
+    EXPECT_EQ(document.TunFilePath(), "");
+    EXPECT_EQ(document.Loops().Count(), 0);
+    EXPECT_EQ(document.ModeMap().GetModeMapSize(), 0);
+    EXPECT_EQ(document.FaceplateLoop(), nullptr);
+    EXPECT_EQ(document.CurrentPVChannelObj(), nullptr);
+    EXPECT_EQ(document.ModeValue(), "Unknown");
+}
+
+TEST(TunFile, DefaultsBuildTheOpcTunerDocument) {
+    Fixture f;
+    f.document.SetDefaults(9);
+    EXPECT_TRUE(f.document.IsValid());
+    EXPECT_EQ(f.document.Archives().Count(), 3);
+    EXPECT_EQ(f.document.Specifics().Collection().size(), 10u);
+    ASSERT_EQ(f.document.Loops().Count(), 1);
+    EXPECT_EQ(f.document.FaceplateLoop()->Description(), "Faceplate");
+    EXPECT_EQ(f.document.CurrentLoop(), f.document.FaceplateLoop());
+    EXPECT_EQ(f.document.CurrentSPChannelObj(), f.document.Archives().SPChannel());
+    EXPECT_EQ(f.document.TunFilePath(), f.programFolder.File("LoopTag.tun"));
+    EXPECT_EQ(f.document.LoopTag(), "LoopTag");
+
+    EXPECT_FALSE(f.document.ReadFromDisk(9, f.programFolder.File("other.tun")));
+    ASSERT_EQ(f.tp.dialogs.Messages().size(), 1u);
+    EXPECT_EQ(f.tp.dialogs.Last().text, "Error: TunFile.ReadFromDisk(1)");
+    EXPECT_EQ(f.tp.dialogs.Last().style, MsgBoxStyle::OKOnly);
+    EXPECT_EQ(f.tp.dialogs.Last().title, "");
+    EXPECT_EQ(f.document.TunFilePath(), f.programFolder.File("LoopTag.tun"));
+    EXPECT_TRUE(std::filesystem::is_empty(f.programFolder.Path()));
+}
+
+TEST(TunFile, FaceplateSendChannelsTakeTheChartedRanges) {
+    Fixture f;
+    f.document.SetDefaults(9);
+    Channel* sendCO = f.document.Specifics().Item(SpecificType::SendCO);
+    Channel* sendSP = f.document.Specifics().Item(SpecificType::SendSP);
+    EXPECT_EQ(sendCO->EngMax(), f.document.Archives().COChannel()->EngMax());
+
+    std::ofstream(f.dataFolder.File("ranges.tun")) << "[Trend]\nNumberOfChannels=3\n"
+                                                   << "[Channel1]\nEngMin=4\nEngMax=20\n"
+                                                   << "[Channel2]\nEngMin=-10\nEngMax=110\n";
+    TunFile read(f.tp.platform);
+    ASSERT_TRUE(read.ReadFromDisk(9, f.dataFolder.File("ranges.tun")));
+    sendCO = read.Specifics().Item(SpecificType::SendCO);
+    sendSP = read.Specifics().Item(SpecificType::SendSP);
+    EXPECT_EQ(sendCO->EngMin(), -10);
+    EXPECT_EQ(sendCO->EngMax(), 110);
+    EXPECT_EQ(sendSP->EngMin(), 4);
+    EXPECT_EQ(sendSP->EngMax(), 20);
+}
+
+TEST(TunFile, UnwritableProgramFolderPutsTheDefaultFileInTheDataFolder) {
+    Fixture f;
+    f.tp.program.folder = f.programFolder.File("missing");
+    f.document.SetDefaults(9);
+    EXPECT_EQ(f.document.TunFilePath(), f.dataFolder.File("LoopTag.tun"));
+
+    TunFile second(f.tp.platform);
+    f.tp.program.folder = f.programFolder.Path() + "/";
+    second.SetDefaults(9);
+    EXPECT_EQ(second.TunFilePath(), f.programFolder.File("LoopTag.tun"));
+}
+
+TEST(TunFile, LoopTagCutsAtTheLastPoint) {
+    Fixture f;
+    f.document.SetDefaults(9);
+    f.document.SetLoopTag("Unit7.A.tun");
+    EXPECT_EQ(f.document.TunFilePath(), f.programFolder.File("Unit7.A.tun"));
+    EXPECT_EQ(f.document.LoopTag(), "Unit7.A");
+    f.document.SetLoopTag("FIC12");
+    EXPECT_EQ(f.document.TunFilePath(), f.programFolder.File("FIC12.tun"));
+    f.document.IniFileObject().SetFileName("C:\\Plant\\Area 1\\TIC 3.old.tun");
+    EXPECT_EQ(f.document.LoopTag(), "TIC 3.old");
+}
+
+TEST(TunFile, EmptyPathsAreRefusedWithTheirMessages) {
+    Fixture f;
+    EXPECT_FALSE(f.document.ReadFromDisk(9, ""));
+    EXPECT_EQ(f.tp.dialogs.Last().text, "Error: TunFile.ReadFromDisk(2)");
+    EXPECT_EQ(f.document.TunFilePath(), "");
+    EXPECT_EQ(f.document.TunerType(), 0);
+
+    f.document.SetDefaults(9);
+    EXPECT_FALSE(f.document.WriteToDisk(""));
+    EXPECT_EQ(f.tp.dialogs.Last().text, "Error: TunFile.WriteToDisk");
+    EXPECT_EQ(f.tp.dialogs.Messages().size(), 2u);
+}
+
+TEST(TunFile, FailedSaveKeepsTheFormerFileAndName) {
+    Fixture f;
+    f.document.SetDefaults(9);
+    const std::string blocked = f.dataFolder.File("no-such-folder/plant.tun");
+    EXPECT_FALSE(f.document.WriteToDisk(blocked));
+    EXPECT_EQ(f.tp.dialogs.Last().text, "Error: TunFile.WriteToDisk");
+    EXPECT_EQ(f.document.TunFilePath(), f.programFolder.File("LoopTag.tun"));
+    EXPECT_FALSE(std::filesystem::exists(blocked));
+}
+
+TEST(TunFile, ConvertFileFormatRewritesOldWordBooleans) {
+    struct Case {
+        const char* version;
+        const char* expectedAuto;
+        const char* expectedManual;
+    };
+    const Case cases[] = {{"12.07.99", "1", "0"},     {"12.0799", "1", "0"},
+                          {"11.5", "1", "0"},         {"12.07.9", "1", "0"},
+                          {"12.08", "TRUE", "false"}, {"13.02", "TRUE", "false"}};
+    for (const Case& c : cases) {
+        test::TestPlatform tp;
+        const std::string path = tp.folder.File("old.tun");
+        std::ofstream(path) << "[version]\ncommon=" << c.version
+                            << "\n[DDE]\nDDE_Item_AutoModeDetect=TRUE\n"
+                            << "DDE_Item_ManualModeDetect=false\n";
+        TunFile document(tp.platform);
+        document.IniFileObject().SetFileName(path);
+        document.ConvertFileFormat();
+        const IniFile& ini = document.IniFileObject();
+        EXPECT_EQ(ini.ReadString("DDE", "DDE_Item_AutoModeDetect", ""), c.expectedAuto)
+            << c.version;
+        EXPECT_EQ(ini.ReadString("DDE", "DDE_Item_ManualModeDetect", ""), c.expectedManual)
+            << c.version;
+        EXPECT_EQ(ini.ReadString("version", "common", ""), c.version) << "never written";
+    }
+}
+
+TEST(TunFile, ConvertFileFormatLeavesOtherTextsAndMissingVersions) {
+    test::TestPlatform tp;
+    const std::string path = tp.folder.File("nover.tun");
+    std::ofstream(path) << "[DDE]\nDDE_Item_AutoModeDetect=Yes\nDDE_Item_ManualModeDetect=fAlSe\n";
+    TunFile document(tp.platform);
+    document.IniFileObject().SetFileName(path);
+    document.ConvertFileFormat();
+    EXPECT_EQ(document.IniFileObject().ReadString("DDE", "DDE_Item_AutoModeDetect", ""), "Yes");
+    EXPECT_EQ(document.IniFileObject().ReadString("DDE", "DDE_Item_ManualModeDetect", ""), "0");
+    EXPECT_EQ(document.IniFileObject().ReadString("version", "common", "none"), "none");
+}
+
+TEST(TunFile, CurrentChannelsFollowTheCurrentLoop) {
+    Fixture f;
+    f.document.SetDefaults(9);
+    bool failed = false;
+    LoopClass* loop = f.document.Loops().Add(2, failed);
+    loop->SetPVChannel(4);
+    loop->SetCOChannel(2);
+    loop->SetSPChannel(0);
+    f.document.Loops().SetCurrentLoop(2);
+    EXPECT_EQ(f.document.CurrentLoop(), loop);
+    EXPECT_EQ(f.document.CurrentPVChannel(), 0);
+    EXPECT_EQ(f.document.CurrentPVChannelObj(), nullptr);
+    EXPECT_EQ(f.document.CurrentCOChannelObj(), f.document.Archives().COChannel());
+    EXPECT_EQ(f.document.CurrentSPChannel(), 0);
+    EXPECT_EQ(f.document.CurrentSPChannelObj(), nullptr);
+
+    bool error = false;
+    f.document.Archives().Add(4, error);
+    EXPECT_EQ(f.document.CurrentPVChannel(), 4);
+    EXPECT_EQ(f.document.CurrentPVChannelObj(), f.document.Archives().Item(4));
+}
+
+TEST(TunFile, ModeValueNeedsTheModeChannelOnline) {
+    Fixture f;
+    f.document.SetDefaults(9);
+    f.document.ModeMap().AddModeMapItem("AUTO", "Automatic");
+    EXPECT_EQ(f.document.ModeValue(), "Unknown");
+
+    Channel* mode = f.document.Specifics().Item(SpecificType::Mode);
+    mode->SetExpectANumber(false);
+    mode->OpcSetRawValue(Variant::Str("AUTO\r\n"), 0xC0, 0, false);
+    EXPECT_EQ(f.document.ModeValue(), "Automatic");
+    mode->OpcSetRawValue(Variant::Str("CAS"), 0xC0, 0, false);
+    EXPECT_EQ(f.document.ModeValue(), "unknown");
+    mode->GoOffline();
+    EXPECT_EQ(f.document.ModeValue(), "Unknown");
+}
+
+TEST(TunFile, ReplacedCollectionsAreKeptAndNullIsIgnored) {
+    Fixture f;
+    f.document.SetDefaults(9);
+    auto archives = std::make_unique<ArchiveChannels>(f.tp.platform);
+    ArchiveChannels* raw = archives.get();
+    f.document.SetArchives(std::move(archives));
+    EXPECT_EQ(&f.document.Archives(), raw);
+    EXPECT_FALSE(f.document.IsValid());
+    f.document.SetArchives(nullptr);
+    EXPECT_EQ(&f.document.Archives(), raw);
+
+    auto loops = std::make_unique<LoopCollection>(f.tp.platform);
+    LoopCollection* rawLoops = loops.get();
+    f.document.SetLoops(std::move(loops));
+    f.document.SetLoops(nullptr);
+    EXPECT_EQ(&f.document.Loops(), rawLoops);
+    EXPECT_EQ(f.document.FaceplateLoop(), nullptr);
 }
 
 }  // namespace
