@@ -4,7 +4,6 @@
 
 #include <fstream>
 #include <string>
-#include <vector>
 
 #include "document/TunFile.h"
 #include "support/TestPlatform.h"
@@ -12,102 +11,76 @@
 namespace cv {
 namespace {
 
-std::vector<int32_t> Types(const SpecificChannels& specifics) {
-    std::vector<int32_t> types;
+// Number:Type of every channel in list order.
+std::string Listed(const SpecificChannels& specifics) {
+    std::string text;
     for (const auto& channel : specifics.Collection()) {
-        EXPECT_EQ(channel->Number(), static_cast<int32_t>(types.size()) + 1);
-        types.push_back(channel->SpecificChannelType());
+        text += std::to_string(channel->Number()) + ":" +
+                std::to_string(channel->SpecificChannelType()) + " ";
     }
-    return types;
+    return text;
 }
 
-const std::vector<int32_t> kTypes1To10{1, 2, 3, 4, 5, 6, 7, 8, 9, 10};
-const std::vector<int32_t> kTypes1To12{1, 2, 3, 4, 5, 6, 7, 8, 9, 10, 11, 12};
+const std::string kTypes1To10 = "1:1 2:2 3:3 4:4 5:5 6:6 7:7 8:8 9:9 10:10 ";
+const std::string kTypes1To12 = kTypes1To10 + "11:11 12:12 ";
 
-// A document of the given kind on a file with the given "DDE" lines.
+// A document of the given kind on a file with the given filter switch.
 struct FileDocument {
-    FileDocument(int32_t tuner, const std::string& ddeLines) : document(tp.platform) {
-        path = tp.folder.File("loop.tun");
-        std::ofstream(path) << "[DDE]\n" << ddeLines << "[OPC]\nOPC_item_PB=TIC1.GAIN\n";
+    FileDocument(int32_t tuner, const std::string& filter) : document(tp.platform) {
+        std::ofstream(tp.folder.File("loop.tun"))
+            << "[DDE]\nRead_Write_Filter=" << filter << "\n[OPC]\nOPC_item_PB=TIC1.GAIN\n";
         document.SetTunerType(tuner);
-        document.IniFileObject().SetFileName(path);
+        document.IniFileObject().SetFileName(tp.folder.File("loop.tun"));
+        document.Specifics().ReadFromDisk(document);
     }
     test::TestPlatform tp;
     TunFile document;
-    std::string path;
+    SpecificChannels& specifics = document.Specifics();
 };
 
-TEST(SpecificChannels, DefaultsAreTypesOneToTenOverOpc) {
-    test::TestPlatform tp;
-    TunFile document(tp.platform);
-    SpecificChannels specifics(tp.platform);
-    specifics.SetDefaults(document);
-    specifics.SetDefaults(document);
-    EXPECT_EQ(Types(specifics), kTypes1To10);
-    for (const auto& channel : specifics.Collection()) {
-        EXPECT_EQ(channel->ComType(), ComTypeCode::Opc);
-    }
-    EXPECT_EQ(specifics.Item(SpecificType::Mode)->Number(), 4);
-    EXPECT_EQ(specifics.Item(SpecificType::Filter), nullptr);
-    EXPECT_FALSE(specifics.FilterChannelsExist());
-}
-
-TEST(SpecificChannels, FilterScanningNeedsTheFilterChannels) {
-    test::TestPlatform tp;
-    TunFile document(tp.platform);
-    SpecificChannels& specifics = document.Specifics();
-    specifics.SetDefaults(document);
-    specifics.SetFilterReadWrite(true);
-    EXPECT_FALSE(specifics.FilterReadWrite());
-    EXPECT_EQ(specifics.FinalChannel(), 10);
-
-    FileDocument file(9, "Read_Write_Filter=0\n");
-    SpecificChannels& read = file.document.Specifics();
-    read.ReadFromDisk(file.document);
-    EXPECT_EQ(Types(read), kTypes1To12);
-    EXPECT_TRUE(read.FilterChannelsExist());
-    EXPECT_FALSE(read.FilterReadWrite());
-    read.SetFilterReadWrite(true);
-    EXPECT_TRUE(read.FilterReadWrite());
-    EXPECT_EQ(read.FinalChannel(), 12);
+TEST(SpecificChannels, DefaultsAreTypesOneToTenOverOpcWithoutFilter) {
+    FileDocument file(9, "1");
+    file.specifics.SetDefaults(file.document);
+    EXPECT_EQ(Listed(file.specifics), kTypes1To10);
+    EXPECT_EQ(file.specifics.Item(SpecificType::Mode)->ComType(), ComTypeCode::Opc);
+    EXPECT_FALSE(file.specifics.FilterChannelsExist());
+    file.specifics.SetFilterReadWrite(true);
+    EXPECT_FALSE(file.specifics.FilterReadWrite());
+    EXPECT_EQ(file.specifics.FinalChannel(), 10);
 }
 
 TEST(SpecificChannels, ReadingFollowsTheTunerKind) {
-    FileDocument opc(9, "Read_Write_Filter=-1\n");
-    opc.document.Specifics().ReadFromDisk(opc.document);
-    EXPECT_TRUE(opc.document.Specifics().FilterReadWrite());
-    EXPECT_EQ(opc.document.Specifics().Item(SpecificType::P)->ItemName(), "TIC1.GAIN");
-    EXPECT_EQ(opc.document.Specifics().Item(SpecificType::SendP)->ItemName(), "TIC1.GAIN");
+    FileDocument opc(9, "-1");
+    EXPECT_EQ(Listed(opc.specifics), kTypes1To12);
+    EXPECT_TRUE(opc.specifics.FilterReadWrite());
+    EXPECT_EQ(opc.specifics.FinalChannel(), 12);
+    EXPECT_EQ(opc.specifics.Item(SpecificType::SendP)->ItemName(), "TIC1.GAIN");
 
-    FileDocument wonderware(4, "Read_Write_Filter=1\n");
-    wonderware.document.Specifics().ReadFromDisk(wonderware.document);
-    EXPECT_EQ(Types(wonderware.document.Specifics()), kTypes1To10);
-    EXPECT_FALSE(wonderware.document.Specifics().FilterReadWrite());
+    FileDocument opcOff(9, "0");
+    EXPECT_TRUE(opcOff.specifics.FilterChannelsExist());
+    EXPECT_FALSE(opcOff.specifics.FilterReadWrite());
 
-    FileDocument archive(5, "Read_Write_Filter=1\n");
-    archive.document.Specifics().SetDefaults(archive.document);
-    archive.document.Specifics().ReadFromDisk(archive.document);
-    EXPECT_TRUE(archive.document.Specifics().Collection().empty());
+    FileDocument wonderware(4, "1");  // no read/write filter
+    EXPECT_EQ(Listed(wonderware.specifics), kTypes1To10);
+    EXPECT_FALSE(wonderware.specifics.FilterReadWrite());
+
+    FileDocument archive(5, "1");  // no faceplate
+    EXPECT_EQ(Listed(archive.specifics), "");
+    archive.specifics.SetDefaults(archive.document);
+    archive.specifics.WriteToDisk(archive.document);
+    EXPECT_EQ(archive.document.IniFileObject().ReadString("OPC", "Send_CO", "none"), "none");
     EXPECT_TRUE(archive.tp.dialogs.Messages().empty());
 }
 
 TEST(SpecificChannels, WritingStoresItemsAndTheFilterSwitch) {
-    FileDocument file(9, "Read_Write_Filter=1\n");
-    SpecificChannels& specifics = file.document.Specifics();
-    specifics.ReadFromDisk(file.document);
-    specifics.Item(SpecificType::SendSP)->SetItemName("TIC1.SP.WRITE");
-    specifics.SetFilterReadWrite(false);
-    specifics.WriteToDisk(file.document);
-
+    FileDocument file(9, "1");
+    file.specifics.Item(SpecificType::SendSP)->SetItemName("TIC1.SP.WRITE");
+    file.specifics.SetFilterReadWrite(false);
+    file.specifics.WriteToDisk(file.document);
     const IniFile& ini = file.document.IniFileObject();
     EXPECT_FALSE(ini.ReadBoolean("DDE", "Read_Write_Filter", true));
     EXPECT_EQ(ini.ReadString("OPC", "Send_SP", ""), "TIC1.SP.WRITE");
     EXPECT_EQ(ini.ReadString("OPC", "Send_PB", ""), "TIC1.GAIN");
-
-    FileDocument noFaceplate(6, "");
-    noFaceplate.document.Specifics().SetDefaults(noFaceplate.document);
-    noFaceplate.document.Specifics().WriteToDisk(noFaceplate.document);
-    EXPECT_EQ(noFaceplate.document.IniFileObject().ReadString("OPC", "Send_CO", "none"), "none");
 }
 
 }  // namespace
