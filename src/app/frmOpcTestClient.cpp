@@ -51,7 +51,7 @@ QLabel* NewLabel(const char* name, const char* caption) {
 }  // namespace
 
 frmOpcTestClient::frmOpcTestClient(Platform& platform, QWidget* parent)
-    : QWidget(parent), mPlatform(platform), mcTunFile(platform), mcChannel(platform) {
+    : QWidget(parent), mPlatform(platform), mcTunFile(platform) {
     setObjectName(QStringLiteral("frmOpcTestClient"));
     setWindowTitle(QString::fromStdString(ProgramTitle()));
     CreateControls();
@@ -198,11 +198,10 @@ void frmOpcTestClient::Load() {
     SetHelpPath(mPlatform);
     mPlatform.run.HelpFile += ">StepsSub";
 
-    // The document of this program's tuner kind; the channel under test is
-    // its SP channel, an OPC channel numbered 3.
-    mcTunFile.SetTunerType(ProgramTunerKind());
-    TestChannel().SetNumber(3);
-    TestChannel().SetComType(ComTypeCode::Opc);
+    // The default document of this program's tuner kind; the channel under
+    // test is its SP channel.
+    mcTunFile.SetDefaults(ProgramTunerKind());
+    mcChannel = mcTunFile.Archives().SPChannel();
 
     ReadRememberedValues();
     FillFields();

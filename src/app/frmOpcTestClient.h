@@ -29,7 +29,8 @@ class frmOpcTestClient : public QWidget {
     explicit frmOpcTestClient(Platform& platform, QWidget* parent = nullptr);
 
     TunFile& Document() { return mcTunFile; }
-    Channel& TestChannel() { return mcChannel; }
+    // The channel under test: the document's SP channel.
+    Channel& TestChannel() { return *mcChannel; }
 
   protected:
     bool eventFilter(QObject* watched, QEvent* event) override;
@@ -69,8 +70,10 @@ class frmOpcTestClient : public QWidget {
     TunFileGeneral& General() { return mcTunFile.General(); }
 
     Platform& mPlatform;
+    // The document lives as long as the window; closing the main window ends
+    // the program, and with it the document.
     TunFile mcTunFile;
-    Channel mcChannel;
+    Channel* mcChannel = nullptr;
     // Fields whose checks wait to run, oldest first; while a check shows a
     // message, no other check starts.
     std::deque<QPointer<QWidget>> mPendingValidations;

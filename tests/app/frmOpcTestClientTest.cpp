@@ -112,10 +112,18 @@ class frmOpcTestClientTest : public QObject {
         QCOMPARE(Box("txtSI")->text().toStdString(), cv::FormatFloat(tp->locale, 1.0, 4));
         QCOMPARE(Channel().DecimalPlaces(), 2);
         QCOMPARE(Channel().LineColor(), 65280);
-        QCOMPARE(Channel().Number(), 3);
         QVERIFY(window->Document().General().ScalePVandCO());
-        QCOMPARE(window->Document().TunerType(), 9);
         QVERIFY(Messages().empty());
+    }
+
+    void worksOnTheDefaultDocumentsSPChannel() {
+        cv::TunFile& document = window->Document();
+        QCOMPARE(document.TunerType(), 9);
+        QCOMPARE(&Channel(), document.Archives().SPChannel());
+        QCOMPARE(document.Archives().Count(), 3);
+        QCOMPARE(Channel().ComType(), 4);
+        // The fake program folder does not exist, so the file goes to the data folder.
+        QCOMPARE(document.TunFilePath(), tp->program.dataFolder + "/LoopTag.tun");
     }
 
     void showsVersionNoticeAndCaptions() {
@@ -376,7 +384,7 @@ class frmOpcTestClientTest : public QObject {
         QCOMPARE(Boxes(), kFirstRunBoxes);
         QCOMPARE(Channel().ScaleFactor(), 1.0);
         QCOMPARE(Channel().DecimalPlaces(), 2);
-        QCOMPARE(Channel().LineColor(), 65280);
+        QCOMPARE(Channel().LineColor(), 65535);  // the SP channel keeps its own yellow
         QVERIFY(Control<QCheckBox>("chkUseScaling")->isChecked());
         QVERIFY(Messages().empty());
 
