@@ -10,7 +10,6 @@
 #include <memory>
 #include <string>
 
-#include "TempFolder.h"
 #include "document/TunFile.h"
 #include "platform/fake/FixedComputerName.h"
 #include "platform/fake/FixedLocale.h"
@@ -20,6 +19,7 @@
 #include "platform/fake/VirtualEventLoop.h"
 #include "platform/posix/FileProfiles.h"
 #include "platform/posix/FileRegistry.h"
+#include "support/TempFolder.h"
 
 namespace {
 
