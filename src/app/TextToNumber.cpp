@@ -122,31 +122,11 @@ float ToSingleOrError(double value) {
     return static_cast<float>(value);
 }
 
-double NumberOf(const Variant& value) {
-    switch (value.VarType()) {
-        case VT_EMPTY:
-            return 0.0;
-        case VT_I2:
-            return value.AsI2();
-        case VT_I4:
-            return value.AsI4();
-        case VT_R4:
-            return value.AsR4();
-        case VT_R8:
-        case VT_DATE:
-            return value.AsR8();
-        case VT_BOOL:
-            return value.AsBool() ? -1.0 : 0.0;
-        default:
-            return NAN;
-    }
-}
-
 }  // namespace
 
 float ValToSingle(const Variant& value) {
     if (value.VarType() != VT_BSTR) {
-        return ToSingleOrError(NumberOf(value));
+        return ToSingleOrError(NumberOf(value).value_or(NAN));
     }
     const std::optional<double> number = Val(value.AsStr());
     return number ? ToSingleOrError(*number) : kValError;

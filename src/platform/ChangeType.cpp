@@ -25,25 +25,6 @@ double RoundHalfEven(double value) {
     return below;
 }
 
-// The number a non-text scalar stands for: empty 0, True -1.
-double NumberOf(const Variant& value) {
-    switch (value.VarType()) {
-        case VT_I2:
-            return value.AsI2();
-        case VT_I4:
-            return value.AsI4();
-        case VT_R4:
-            return value.AsR4();
-        case VT_R8:
-        case VT_DATE:
-            return value.AsR8();
-        case VT_BOOL:
-            return value.AsBool() ? -1.0 : 0.0;
-        default:
-            return 0.0;
-    }
-}
-
 ErrorInfo NumberToType(double number, uint16_t vt, Variant& result) {
     switch (vt) {
         case VT_I2:
@@ -113,7 +94,8 @@ ErrorInfo Convert(const Variant& source, uint16_t vt, const platform::Locale& lo
     if (from == VT_BSTR) {
         return TextToValue(source.AsStr(), vt, locale, result);
     }
-    return NumberToType(NumberOf(source), vt, result);
+    // Null, text and arrays were handled above: what is left has a number.
+    return NumberToType(NumberOf(source).value_or(0.0), vt, result);
 }
 
 }  // namespace

@@ -85,6 +85,26 @@ int32_t Variant::LowerBound() const {
     return array != nullptr ? array->lowerBound : 0;
 }
 
+std::optional<double> NumberOf(const Variant& value) {
+    switch (value.VarType()) {
+        case VT_EMPTY:
+            return 0.0;
+        case VT_I2:
+            return value.AsI2();
+        case VT_I4:
+            return value.AsI4();
+        case VT_R4:
+            return value.AsR4();
+        case VT_R8:
+        case VT_DATE:
+            return value.AsR8();
+        case VT_BOOL:
+            return value.AsBool() ? -1.0 : 0.0;
+        default:
+            return std::nullopt;
+    }
+}
+
 std::string TextOf(const Variant& value, const platform::Locale& locale) {
     Variant text;
     ChangeType(text, value, VT_BSTR, locale);

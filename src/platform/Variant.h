@@ -1,6 +1,7 @@
 #pragma once
 
 #include <cstdint>
+#include <optional>
 #include <string>
 #include <variant>
 #include <vector>
@@ -102,5 +103,9 @@ ErrorInfo ChangeType(Variant& result, const Variant& source, uint16_t vt,
 // The value's text as ChangeType to VT_BSTR gives it; empty when it has
 // none (null, arrays).
 std::string TextOf(const Variant& value, const platform::Locale& locale);
+
+// The number a scalar that is not text stands for: empty 0, True -1, a date
+// its day count. Nothing for null, text and arrays.
+std::optional<double> NumberOf(const Variant& value);
 
 }  // namespace cv
