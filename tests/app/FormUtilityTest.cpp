@@ -1,11 +1,9 @@
 #include <QComboBox>
 #include <QGroupBox>
-#include <QGuiApplication>
 #include <QLineEdit>
 #include <QListWidget>
 #include <QPushButton>
 #include <QScreen>
-#include <QVBoxLayout>
 #include <QtTest>
 
 #include "app/FormUtility.h"
@@ -36,18 +34,13 @@ class FormUtilityTest : public QObject {
         QVERIFY(inFrame->isEnabled());
         QVERIFY(ok->isEnabled());
         QCOMPARE(form.cursor().shape(), Qt::ArrowCursor);
-    }
-
-    void busyLeavesACancelButtonAsItWas() {
-        QWidget form;
-        auto* cancel = new QPushButton(&form);
-        cancel->setProperty("Tag", QStringLiteral("Cancel"));
+        // A Cancel button is left as it was.
         cancel->setEnabled(false);
         cv::SetControlsBusy(0, form);
         QVERIFY(!cancel->isEnabled());
     }
 
-    void findsExactEntries() {
+    void findsExactEntriesOrThePlaceInASortedList() {
         QComboBox combo;
         combo.addItems({"Beta", "alpha", "Alpha"});
         QCOMPARE(cv::FindListEntry(combo, "Alpha"), int16_t{2});
@@ -59,10 +52,8 @@ class FormUtilityTest : public QObject {
         QLineEdit notAList("y");
         QCOMPARE(cv::FindListEntry(notAList, "y"), int16_t{-1});
         QCOMPARE(cv::FindListEntry(notAList, "y", 0), int16_t{-1});
-    }
-
-    void findsThePlaceInASortedListIgnoringCase() {
-        QListWidget list;
+        // In a sorted list, the place of the text, ignoring case.
+        list.clear();
         list.addItems({"apple", "Cherry", "melon"});
         QCOMPARE(cv::FindListEntry(list, "BANANA", 0), int16_t{1});
         QCOMPARE(cv::FindListEntry(list, "cherry", 0), int16_t{1});
