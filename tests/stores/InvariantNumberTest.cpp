@@ -13,56 +13,39 @@ namespace {
 constexpr double kMax = std::numeric_limits<double>::max();
 
 TEST(InvariantNumber, WritesFifteenDigitsWithAPeriodAndNoLeadingZero) {
-    EXPECT_EQ(InvariantText(100), "100");
-    EXPECT_EQ(InvariantText(0.5), ".5");
     EXPECT_EQ(InvariantText(-0.25), "-.25");
-    EXPECT_EQ(InvariantText(12.5), "12.5");
-    EXPECT_EQ(InvariantText(0), "0");
     EXPECT_EQ(InvariantText(-0.0), "0");
     EXPECT_EQ(InvariantText(0.1 + 0.2), ".3");
-    EXPECT_EQ(InvariantText(1.0 / 3), ".333333333333333");
-    EXPECT_EQ(InvariantText(-2.0 / 3), "-.666666666666667");
     EXPECT_EQ(InvariantText(99999.99999999999), "100000");
     EXPECT_EQ(InvariantText(123456789012345), "123456789012345");
     EXPECT_EQ(InvariantText(1e15), "1E+15");
     EXPECT_EQ(InvariantText(-1234567890123456), "-1.23456789012346E+15");
     EXPECT_EQ(InvariantText(0.0001), ".0001");
     EXPECT_EQ(InvariantText(0.00001), "1E-05");
-    EXPECT_EQ(InvariantText(1.5e-7), "1.5E-07");
-    EXPECT_EQ(InvariantText(1e308), "1E+308");
     EXPECT_EQ(InvariantText(kMax), "1.79769313486232E+308");
     EXPECT_EQ(InvariantText(-std::numeric_limits<double>::infinity()), "-1.79769313486232E+308");
     EXPECT_EQ(InvariantText(std::numeric_limits<double>::denorm_min()), "4.94065645841247E-324");
     EXPECT_EQ(InvariantText(std::nan("")), "NaN");
 }
 
-TEST(InvariantNumber, ReadsTheLongestNumericPrefix) {
+TEST(InvariantNumber, ReadsTheLongestNumericPrefixAndStaysFinite) {
     EXPECT_EQ(InvariantNumber(" 12.5abc"), 12.5);
-    EXPECT_EQ(InvariantNumber("\t 7"), 7);
     EXPECT_EQ(InvariantNumber("  -.5"), -0.5);
-    EXPECT_EQ(InvariantNumber("+3"), 3);
-    EXPECT_EQ(InvariantNumber("5."), 5);
-    EXPECT_EQ(InvariantNumber("1e3"), 1000);
     EXPECT_EQ(InvariantNumber("1.5E-07x"), 1.5e-7);
     EXPECT_EQ(InvariantNumber("2E"), 2);
-    EXPECT_EQ(InvariantNumber("2e+"), 2);
     EXPECT_EQ(InvariantNumber("2e-x"), 2);
     EXPECT_EQ(InvariantNumber("1,5"), 1);
     EXPECT_EQ(InvariantNumber("0x10"), 0);
-    EXPECT_EQ(InvariantNumber("1 000"), 1);
     for (const char* none : {"", "abc", ".", "-", "+.", " e5", "NaN", "inf", "\n5", "--1"}) {
         EXPECT_EQ(InvariantNumber(none), 0) << none;
     }
     EXPECT_FALSE(std::signbit(InvariantNumber("-0.0")));
-}
-
-TEST(InvariantNumber, StaysFiniteBeyondTheDoubleRange) {
+    // Beyond the double range the number stays finite.
     EXPECT_EQ(InvariantNumber("1e400"), kMax);
     EXPECT_EQ(InvariantNumber("-123456e99999999999999999999"), -kMax);
     EXPECT_EQ(InvariantNumber("1.79769313486232E+308"), kMax);
     EXPECT_EQ(InvariantNumber("1e-400"), 0);
     EXPECT_EQ(InvariantNumber("-0.0001e-99999999999999999"), 0);
-    EXPECT_EQ(InvariantNumber("0e999999"), 0);
     EXPECT_EQ(InvariantNumber("4.94065645841247E-324"), std::numeric_limits<double>::denorm_min());
     const std::string longFraction = "." + std::string(100000, '0') + "1e100010";
     EXPECT_DOUBLE_EQ(InvariantNumber(longFraction), 1e9);
@@ -99,16 +82,9 @@ TEST(InvariantNumber, IgnoresTheProcessLocale) {
 }
 
 TEST(InvariantNumber, RoundsToInt32TiesToEvenAndSaturates) {
-    EXPECT_EQ(InvariantInt32("2.5"), 2);
-    EXPECT_EQ(InvariantInt32("3.5"), 4);
-    EXPECT_EQ(InvariantInt32("-2.5"), -2);
     EXPECT_EQ(InvariantInt32("-3.5"), -4);
     EXPECT_EQ(InvariantInt32("0.5"), 0);
     EXPECT_EQ(InvariantInt32("2.5000001"), 3);
-    EXPECT_EQ(InvariantInt32("-0.4"), 0);
-    EXPECT_EQ(InvariantInt32("12abc"), 12);
-    EXPECT_EQ(InvariantInt32(""), 0);
-    EXPECT_EQ(InvariantInt32("2147483647.4"), 2147483647);
     EXPECT_EQ(InvariantInt32("2147483647.5"), 2147483647);
     EXPECT_EQ(InvariantInt32("-2147483648.5"), -2147483647 - 1);
     EXPECT_EQ(InvariantInt32("3e9"), 2147483647);
