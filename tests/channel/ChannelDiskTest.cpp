@@ -2,6 +2,7 @@
 
 #include <initializer_list>
 #include <memory>
+#include <sstream>
 #include <string>
 #include <tuple>
 
@@ -47,10 +48,9 @@ void Fill(Channel& c, int32_t lSeed) {
 
 // A document whose tuning file lies in a fresh folder, with the shared
 // settings file beside it; every check reads the files afresh.
-class ChannelDisk : public ::testing::Test {
-  protected:
+struct ChannelDisk : testing::Test {
     ChannelDisk() {
-        Ini().SetFileName(tp.folder.File("Loop.tun"));
+        Ini().SetFileName(tunPath);
         shared.SetFileName("Corvalen.ini");
     }
     IniFile& Ini() { return doc.IniFileObject(); }
@@ -71,17 +71,13 @@ class ChannelDisk : public ::testing::Test {
         doc.SetTunerType(lTuner);
         channel.WriteToDisk(shared, Ini(), doc.TunerTypeObj());
     }
-    std::string Stored(const std::string& sFile, const std::string& sSection,
-                       const std::string& sItem) {
+    std::string Stored(const std::string& sFile, const char* sSection, const char* sItem) {
         IniFile reader(tp.profiles);
         reader.SetFileName(sFile);
         return reader.ReadString(sSection, sItem, "-");
     }
-    std::string Tun(const std::string& sSection, const std::string& sItem) {
-        return Stored(Ini().FileName(), sSection, sItem);
-    }
-    std::string Shared(const std::string& sSection, const std::string& sItem) {
-        return Stored("Corvalen.ini", sSection, sItem);
+    std::string Tun(const char* sSection, const char* sItem) {
+        return Stored(tunPath, sSection, sItem);
     }
     void ExpectRows(std::initializer_list<Row> rows) {
         for (const Row& row : rows) {
@@ -97,26 +93,22 @@ class ChannelDisk : public ::testing::Test {
     }
 
     test::TestPlatform tp;
+    std::string tunPath = tp.folder.File("Loop.tun");
     TunFile doc{tp.platform};
     IniFile shared{tp.profiles};
 };
 
 TEST_F(ChannelDisk, SpecificChannelsReadTheKeysOfTheirTunerKind) {
-    for (const auto& [sKey, sValue] : std::initializer_list<std::pair<const char*, const char*>>{
-             {"DDE_FilterAppTopic", "Flt|Top"},
-             {"DDE_item_PB", "pb"},
-             {"DDE_item_SP", "sp"},
-             {"DDE_item_Integral", "int"},
-             {"DDE_item_Filter", "flt"}}) {
-        Ini().WriteString("DDE", sKey, sValue);
-        Ini().WriteString("OPC", std::string(sKey).replace(0, 3, "OPC"), sValue);
+    const std::pair<std::string, const char*> keys[] = {
+        {"_FilterAppTopic", "Flt|Top"}, {"_item_PB", "pb"},          {"_item_SP", "sp"},
+        {"_item_Integral", "int"},      {"_item_Filter", "flt"},     {"_ServerID", "\\\\N1\\Srv.1"},
+        {"_AccessPath", "AP"},          {"_FilterServerID", "FSrv"}, {"_FilterAccessPath", "FAP"}};
+    for (const auto& [sKey, sValue] : keys) {
+        Ini().WriteString("DDE", "DDE" + sKey, sValue);
+        Ini().WriteString("OPC", "OPC" + sKey, sValue);
     }
     Ini().WriteString("DDE", "Send_SP", "send");
     Ini().WriteString("OPC", "Send_SP", "send");
-    Ini().WriteString("OPC", "OPC_ServerID", "\\\\N1\\Srv.1");
-    Ini().WriteString("OPC", "OPC_AccessPath", "AP");
-    Ini().WriteString("OPC", "OPC_FilterServerID", "FSrv");
-    Ini().WriteString("OPC", "OPC_FilterAccessPath", "FAP");
     ExpectRows({{1, 1, 1, kDde, "Simulate|Loop", "pb", "Proportional"},
                 {1, 11, 11, kDde, "Flt|Top", "flt", "Filter"},
                 {2, 8, 8, kDde, "VIEW|TAGNAME", "int", "I value"},
@@ -213,32 +205,26 @@ TEST_F(ChannelDisk, ColoursOfPvCoAndSpLiveInTheSharedFile) {
     auto pv = Make(1);
     pv->SetLineColor(4242);
     Write(9, *pv);
-    EXPECT_EQ(std::tuple(Shared("FacePlate", "ColorPV"), Tun("Channel1", "LineColor")),
-              std::tuple("4242", "999"));
+    EXPECT_EQ(
+        std::tuple(Stored("Corvalen.ini", "FacePlate", "ColorPV"), Tun("Channel1", "LineColor")),
+        std::tuple("4242", "999"));
     pv->SetNumber(6);
     Write(9, *pv);
     EXPECT_EQ(Tun("Channel6", "LineColor"), "4242");
 }
 
 TEST_F(ChannelDisk, WritesKeepTheFormatsOfEachKind) {
-    const char* kOpcKeys[] = {"OPC_item_PB",
-                              "OPC_item_Integral",
-                              "OPC_item_Derivative",
-                              "OPC_item_ControllerMode",
-                              "Send_CO",
-                              "Send_SP",
-                              "Send_PB",
-                              "Send_Integral",
-                              "Send_Derivative",
-                              "Send_mode",
-                              "OPC_item_Filter",
-                              "Send_Filter"};
+    std::istringstream opcKeys(
+        "OPC_item_PB OPC_item_Integral OPC_item_Derivative OPC_item_ControllerMode Send_CO Send_SP "
+        "Send_PB Send_Integral Send_Derivative Send_mode OPC_item_Filter Send_Filter");
     for (int32_t lType = 1; lType <= 12; ++lType) {
         auto c = Make(lType, lType);
         c->SetItemName("it" + std::to_string(lType));
         c->SetOpcNodeAndServer(lType == 11 ? "\\\\N\\Filter.1" : "Other.1");
         Write(9, *c);
-        EXPECT_EQ(Tun("OPC", kOpcKeys[lType - 1]), "it" + std::to_string(lType));
+        std::string sKey;
+        opcKeys >> sKey;
+        EXPECT_EQ(Tun("OPC", sKey.c_str()), c->ItemName());
         Write(7, *c);  // the PLC tuner writes no loop-specific keys
     }
     EXPECT_EQ(std::tuple(Tun("OPC", "OPC_FilterServerID"), Tun("OPC", "OPC_ServerID")),

@@ -1,6 +1,7 @@
 #include <gtest/gtest.h>
 
 #include <chrono>
+#include <memory>
 
 #include "channel/Channel.h"
 #include "platform/OleDate.h"
@@ -36,7 +37,10 @@ TEST_F(OpcChannel, ArraysBecomeLinesAndTextsStopAtNul) {
     EXPECT_EQ(channel.RawValue(), Variant::Str("ab"));
 }
 
-TEST_F(OpcChannel, QualityDecidesTheState) {
+TEST_F(OpcChannel, FirstValueMustBeANumberAndQualityDecidesTheState) {
+    channel.OpcSetRawValue(Variant::Str("abc"), kGood, 0, false);
+    EXPECT_FALSE(channel.IsOnline());
+    EXPECT_EQ(channel.ErrorStr(), "\"abc\" has been sent from the Server.  This is not a number.");
     channel.OpcSetRawValue(Variant::R8(1), 0x08, 0, false);  // bad while offline
     EXPECT_FALSE(channel.IsOnline());
     EXPECT_EQ(channel.ErrorStr(), "");
@@ -54,12 +58,6 @@ TEST_F(OpcChannel, QualityDecidesTheState) {
     EXPECT_EQ(channel.ErrorStr(), "Bad value of unknown status reported by OPC Server.");
 }
 
-TEST_F(OpcChannel, FirstValueMustBeANumber) {
-    channel.OpcSetRawValue(Variant::Str("abc"), kGood, 0, false);
-    EXPECT_FALSE(channel.IsOnline());
-    EXPECT_EQ(channel.ErrorStr(), "\"abc\" has been sent from the Server.  This is not a number.");
-}
-
 TEST_F(OpcChannel, UncertainWarningOncePerChannelAndNoSilencesAll) {
     channel.OpcSetRawValue(Variant::R8(7), kUncertain, 0, false);
     ASSERT_TRUE(channel.IsOnline());
@@ -71,30 +69,27 @@ TEST_F(OpcChannel, UncertainWarningOncePerChannelAndNoSilencesAll) {
     EXPECT_EQ(channel.RawValue(), Variant::R8(8));
     EXPECT_EQ(tp.dialogs.Messages().size(), 1u);
 
-    Channel hda(tp.platform);
-    hda.SetComType(ComTypeCode::Opc);
-    hda.SetExpectANumber(false);
-    hda.OpcSetRawValue(Variant::R8(1), 0x58, 0, false);
-    hda.SetComType(ComTypeCode::OpcHda);
-    hda.RawValue();
+    // Other channels ask once each, over HDA too, until one is answered No.
+    auto uncertain = [&](int32_t lQuality) {
+        auto other = std::make_unique<Channel>(tp.platform);
+        other->SetComType(ComTypeCode::Opc);
+        other->SetExpectANumber(false);
+        other->OpcSetRawValue(Variant::R8(1), lQuality, 0, false);
+        return other;
+    };
+    auto hda = uncertain(0x58);
+    hda->SetComType(ComTypeCode::OpcHda);
+    hda->RawValue();
     ASSERT_EQ(tp.dialogs.Messages().size(), 2u);
     EXPECT_NE(tp.dialogs.Last().text.find("OPC HDA Server.  The reported reason is :\"Uncertain "
                                           "value - Sub normal\""),
               std::string::npos);
-
-    Channel other(tp.platform);
-    other.SetComType(ComTypeCode::Opc);
-    other.SetExpectANumber(false);
-    other.OpcSetRawValue(Variant::R8(1), 0x44, 0, false);
     tp.dialogs.QueueAnswer(MsgBoxResult::No);
-    other.RawValue();
+    uncertain(0x44)->RawValue();
     ASSERT_EQ(tp.dialogs.Messages().size(), 3u);
     EXPECT_NE(tp.dialogs.Last().text.find("\"Uncertain value - Last usable\""), std::string::npos);
     EXPECT_TRUE(tp.run.UncertainWarningOff);
-    Channel third(tp.platform);
-    third.SetComType(ComTypeCode::Opc);
-    third.OpcSetRawValue(Variant::R8(1), kUncertain, 0, false);
-    third.RawValue();
+    uncertain(kUncertain)->RawValue();
     EXPECT_EQ(tp.dialogs.Messages().size(), 3u);
 }
 

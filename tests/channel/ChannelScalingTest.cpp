@@ -12,18 +12,11 @@ namespace {
 constexpr auto kEng = RangeType::Engineering;
 constexpr auto kInst = RangeType::Instrument;
 
-struct ScalingCase {
-    int32_t tuner;
-    int32_t number;
-    bool scalePVandCO;
-    bool scaleSP;
-    bool abIntegerFile;
-    bool needs;
-    bool priorToOutput;
-};
-
 TEST(ChannelScaling, FlagsFollowTunerKindNumberAndSettings) {
-    const ScalingCase cases[] = {
+    const struct {
+        int32_t tuner, number;
+        bool scalePVandCO, scaleSP, abIntegerFile, needs, priorToOutput;
+    } cases[] = {
         {9, 1, true, false, false, true, true},    {9, 1, false, true, false, false, false},
         {9, 2, true, false, true, true, false},    {9, 2, true, false, false, true, true},
         {9, 3, true, false, false, false, false},  {9, 3, true, true, true, true, true},
@@ -31,7 +24,7 @@ TEST(ChannelScaling, FlagsFollowTunerKindNumberAndSettings) {
         {9, 0, false, false, false, false, false}, {5, 1, false, false, false, true, true},
         {5, 2, false, false, true, true, true},
     };
-    for (const ScalingCase& c : cases) {
+    for (const auto& c : cases) {
         test::TestPlatform tp;
         TunFile tunFile(tp.platform);
         tunFile.SetTunerType(c.tuner);
@@ -47,28 +40,20 @@ TEST(ChannelScaling, FlagsFollowTunerKindNumberAndSettings) {
     }
 }
 
-TEST(ChannelScaling, EqualRangesNeverScale) {
+// The PV of an OPC tuner that scales PV and CO, on a 4 to 20 instrument range.
+struct ScaledPv : testing::Test {
+    ScaledPv() {
+        tunFile.SetTunerType(9);
+        tunFile.General().SetScalePVandCO(true);
+        channel.SetNumber(1);
+        channel.SetRange(kInst, 4, 20);
+    }
     test::TestPlatform tp;
-    TunFile tunFile(tp.platform);
-    tunFile.SetTunerType(9);
-    tunFile.General().SetScalePVandCO(true);
-    Channel channel(tp.platform);
-    channel.SetNumber(1);
-    channel.SetRange(kEng, 4, 20);
-    channel.SetRange(kInst, 4, 20);
-    EXPECT_FALSE(channel.NeedsScaling(tunFile));
-    channel.SetRange(kInst, 14, 30);  // same slope, shifted
-    EXPECT_TRUE(channel.NeedsScaling(tunFile));
-}
+    TunFile tunFile{tp.platform};
+    Channel channel{tp.platform};
+};
 
-TEST(ChannelScaling, CurrentValueConvertsOnlyOnceFlagsAreSet) {
-    test::TestPlatform tp;
-    TunFile tunFile(tp.platform);
-    tunFile.SetTunerType(9);
-    tunFile.General().SetScalePVandCO(true);
-    Channel channel(tp.platform);
-    channel.SetNumber(1);
-    channel.SetRange(kInst, 4, 20);
+TEST_F(ScaledPv, CurrentValueConvertsOnlyOnceFlagsAreSet) {
     EXPECT_EQ(channel.CurrentValue(), 0);  // offline, flags not yet set
     channel.SetComType(ComTypeCode::Opc);
     channel.OpcSetRawValue(Variant::I2(12), 0xC0, 0, false);
@@ -78,6 +63,23 @@ TEST(ChannelScaling, CurrentValueConvertsOnlyOnceFlagsAreSet) {
     EXPECT_EQ(channel.FormatCurrentValue(), "50.00");
     channel.GoOffline();
     EXPECT_EQ(channel.CurrentValue(), -25);  // raw 0 while offline
+
+    channel.SetRange(kEng, 4, 20);  // equal ranges never scale
+    EXPECT_FALSE(channel.NeedsScaling(tunFile));
+    channel.SetRange(kInst, 14, 30);  // same slope, shifted
+    EXPECT_TRUE(channel.NeedsScaling(tunFile));
+}
+
+TEST_F(ScaledPv, NonNumberFallsBackToTextUnscaledWithTheQuestion) {
+    ASSERT_TRUE(channel.NeedsScaling(tunFile));
+    channel.SetExpectANumber(false);
+    channel.SetComType(ComTypeCode::Opc);
+    channel.OpcSetRawValue(Variant::Str("7.5 kPa"), 0xC0, 0, false);
+    EXPECT_FLOAT_EQ(channel.CurrentValue(), 7.5);
+    ASSERT_EQ(tp.dialogs.Messages().size(), 1u);
+    EXPECT_EQ(tp.dialogs.Last().title, "Conversion errors");
+    channel.OpcSetRawValue(Variant::R8(1e308), 0xC0, 0, false);  // scaling overflows
+    EXPECT_TRUE(std::isfinite(channel.CurrentValue()));
 }
 
 TEST(ChannelScaling, TextValuesFollowTheRegionalSettings) {
@@ -91,26 +93,6 @@ TEST(ChannelScaling, TextValuesFollowTheRegionalSettings) {
         EXPECT_EQ(channel.CurrentValue(), 12.5);
         EXPECT_TRUE(tp->dialogs.Messages().empty());
     }
-    EXPECT_EQ(Channel(comma.platform).FormatDecPt(0.5), "0,50");
-}
-
-TEST(ChannelScaling, NonNumberFallsBackToTextUnscaledWithTheQuestion) {
-    test::TestPlatform tp;
-    TunFile tunFile(tp.platform);
-    tunFile.SetTunerType(9);
-    tunFile.General().SetScalePVandCO(true);
-    Channel channel(tp.platform);
-    channel.SetNumber(1);
-    channel.SetRange(kInst, 4, 20);
-    ASSERT_TRUE(channel.NeedsScaling(tunFile));
-    channel.SetExpectANumber(false);
-    channel.SetComType(ComTypeCode::Opc);
-    channel.OpcSetRawValue(Variant::Str("7.5 kPa"), 0xC0, 0, false);
-    EXPECT_FLOAT_EQ(channel.CurrentValue(), 7.5);
-    ASSERT_EQ(tp.dialogs.Messages().size(), 1u);
-    EXPECT_EQ(tp.dialogs.Last().title, "Conversion errors");
-    channel.OpcSetRawValue(Variant::R8(1e308), 0xC0, 0, false);  // scaling overflows
-    EXPECT_TRUE(std::isfinite(channel.CurrentValue()));
 }
 
 TEST(ChannelScaling, PercentConversionsAndTheirFailures) {
