@@ -28,25 +28,26 @@ void Fill(ArchiveChannels& archives, int32_t n) {
     }
 }
 
-// A document of the given kind whose tuning file holds the given count.
-struct CountedFile {
-    CountedFile(int32_t tuner, const std::string& count) : document(tp.platform) {
-        std::ofstream(path) << "[Trend]\nNumberOfChannels=" << count << "\n";
-        document.SetTunerType(tuner);
-        document.IniFileObject().SetFileName(path);
-    }
-    int32_t Read() {
-        EXPECT_TRUE(document.Archives().ReadFromDisk(document));
-        return document.Archives().Count();
-    }
+// The count a document of the given kind reads from a file holding sCount.
+int32_t CountRead(int32_t lTuner, const std::string& sCount, bool bDefaultsFirst = false) {
     test::TestPlatform tp;
-    std::string path = tp.folder.File("count.tun");
-    TunFile document;
+    TunFile document(tp.platform);
+    std::ofstream(tp.folder.File("count.tun")) << "[Trend]\nNumberOfChannels=" << sCount << "\n";
+    document.SetTunerType(lTuner);
+    document.IniFileObject().SetFileName(tp.folder.File("count.tun"));
+    if (bDefaultsFirst) {
+        document.Archives().SetDefaults(document);
+    }
+    EXPECT_TRUE(document.Archives().ReadFromDisk(document));
+    return document.Archives().Count();
+}
+
+struct Archives : testing::Test {
+    test::TestPlatform tp;
+    ArchiveChannels archives{tp.platform};
 };
 
-TEST(ArchiveChannels, RemoveRenumbersAndFindSearchesOn) {
-    test::TestPlatform tp;
-    ArchiveChannels archives(tp.platform);
+TEST_F(Archives, RemoveRenumbersFindSearchesOnAndAddStopsAtTheLimit) {
     Fill(archives, 4);
     Channel* second = archives.Item(2);
     archives.Remove(second);
@@ -54,9 +55,12 @@ TEST(ArchiveChannels, RemoveRenumbersAndFindSearchesOn) {
     EXPECT_EQ(Listed(archives), "1:C1 2:C3 3:C4 ");
     EXPECT_EQ(archives.SPChannel()->Description(), "C4");
 
-    ArchiveChannels other(tp.platform);
-    Fill(other, 7);
-    Channel* stranger = other.Item(7);
+    ArchiveChannels full(tp.platform);
+    Fill(full, ArchiveChannels::kMaxChannels);
+    bool error = false;
+    EXPECT_EQ(full.Add(ArchiveChannels::kMaxChannels + 1, error), nullptr);
+    EXPECT_TRUE(error);
+    Channel* stranger = full.Item(7);
     archives.Remove(stranger);
     EXPECT_NE(stranger, nullptr);
     EXPECT_EQ(archives.Count(), 3);
@@ -67,36 +71,19 @@ TEST(ArchiveChannels, RemoveRenumbersAndFindSearchesOn) {
     EXPECT_EQ(archives.FindChannel("c3", 1), 0);
 }
 
-TEST(ArchiveChannels, AddRefusesBeyondTheLimit) {
-    test::TestPlatform tp;
-    ArchiveChannels archives(tp.platform);
-    Fill(archives, ArchiveChannels::kMaxChannels);
-    bool error = false;
-    EXPECT_EQ(archives.Add(ArchiveChannels::kMaxChannels + 1, error), nullptr);
-    EXPECT_TRUE(error);
-}
-
-TEST(ArchiveChannels, CopyIsDeepAndCopyFromConsumesTheSource) {
-    test::TestPlatform tp;
-    ArchiveChannels archives(tp.platform);
+TEST_F(Archives, CopyIsDeepCopyFromConsumesTheSourceAndDisplayLimitsFollowTheMaster) {
     Fill(archives, 3);
     archives.Item(1)->SetItemName("TIC101.PV");
     std::unique_ptr<ArchiveChannels> copy = archives.Copy();
     EXPECT_NE(copy->Item(1), archives.Item(1));
     EXPECT_EQ(copy->Item(1)->ItemName(), "TIC101.PV");
-
     copy->Item(1)->SetDescription("edited");
     Channel* removed = copy->Item(2);
     copy->Remove(removed);  // the former SP is now number 2
     archives.CopyFrom(copy);
     EXPECT_EQ(copy, nullptr);
     EXPECT_EQ(Listed(archives), "1:edited 2:C3 3:C3 ");
-}
 
-TEST(ArchiveChannels, DisplayLimitsFollowTheMaster) {
-    test::TestPlatform tp;
-    ArchiveChannels archives(tp.platform);
-    Fill(archives, 3);
     archives.PVChannel()->SetRange(RangeType::Display, 50, 200);
     archives.PVChannel()->SetEngUnits("degC");
     archives.SetPVSPDisplayLimitsEqual(2);
@@ -110,43 +97,20 @@ TEST(ArchiveChannels, DisplayLimitsFollowTheMaster) {
 }
 
 TEST(ArchiveChannels, StoredCountIsBoundedByTheTunerKind) {
-    EXPECT_EQ(CountedFile(4, "5").Read(), 3);  // faceplate, no extra trends
-    EXPECT_EQ(CountedFile(9, "5").Read(), 5);
-    EXPECT_EQ(CountedFile(9, "1").Read(), 3);
-    EXPECT_EQ(CountedFile(5, "1").Read(), 2);  // extra trends, no faceplate
-    EXPECT_EQ(CountedFile(5, "-7").Read(), 2);
+    EXPECT_EQ(CountRead(4, "5"), 3);  // faceplate, no extra trends
+    EXPECT_EQ(CountRead(9, "5"), 5);
+    EXPECT_EQ(CountRead(9, "1"), 3);
+    EXPECT_EQ(CountRead(5, "1"), 2);  // extra trends, no faceplate
+    EXPECT_EQ(CountRead(5, "-7"), 2);
     // A typed count in the billions reads the most the collection holds.
-    EXPECT_EQ(CountedFile(9, "2000000000").Read(), ArchiveChannels::kMaxChannels);
-    EXPECT_EQ(CountedFile(9, "1E300").Read(), ArchiveChannels::kMaxChannels);
-
-    CountedFile again(9, "4");
-    again.document.Archives().SetDefaults(again.document);
-    EXPECT_EQ(again.Read(), 4) << "reading replaces what was held";
+    EXPECT_EQ(CountRead(9, "2000000000"), ArchiveChannels::kMaxChannels);
+    EXPECT_EQ(CountRead(9, "1E300"), ArchiveChannels::kMaxChannels);
+    EXPECT_EQ(CountRead(9, "4", true), 4) << "reading replaces what was held";
 }
 
-TEST(ArchiveChannels, WritingFewerChannelsErasesTheStaleSections) {
-    CountedFile file(9, "5");
-    ASSERT_EQ(file.Read(), 5);
-    ArchiveChannels& archives = file.document.Archives();
-    IniFile& ini = file.document.IniFileObject();
-    archives.WriteToDisk(ini, file.document.TunerTypeObj());
-    EXPECT_EQ(ini.ReadString("Channel5", "Description", ""), "Trend2");
-
-    for (Channel* extra = archives.Item(4); extra != nullptr; extra = archives.Item(4)) {
-        archives.Remove(extra);
-    }
-    archives.WriteToDisk(ini, file.document.TunerTypeObj());
-    EXPECT_EQ(ini.ReadLong("Trend", "NumberOfChannels", 0, 0, 0), 3);
-    EXPECT_EQ(ini.ReadString("Channel3", "Description", ""), "SP");
-    EXPECT_EQ(ini.ReadString("Channel4", "Description", "gone"), "gone");
-    EXPECT_EQ(ini.ReadString("Channel5", "DecimalPlaces", "gone"), "gone");
-}
-
-TEST(ArchiveChannels, DefaultsArePvCoSpOverOpcWithSharedColours) {
-    test::TestPlatform tp;
+TEST_F(Archives, DefaultsArePvCoSpOverOpcWithSharedColours) {
     std::ofstream(tp.folder.File("Corvalen.ini")) << "[FacePlate]\nColorPV=255\nLineWidthSP=4\n";
     TunFile document(tp.platform);
-    ArchiveChannels archives(tp.platform);
     Fill(archives, 5);
     archives.SetDefaults(document);
     ASSERT_EQ(archives.Count(), 3);

