@@ -9,42 +9,20 @@ namespace {
 
 using namespace std::string_literals;
 
-std::string Edited(const std::string& text, auto edit) {
-    IniDocument document = IniDocument::Parse(text);
-    edit(document);
-    return document.Serialise();
-}
-
 TEST(IniDocument, RewritesEveryByteItDidNotChange) {
-    const std::string texts[] = {
-        "",
-        "[A]\r\nx=1\r\n",
-        "[A]\nx=1\n; note\n\n[B]\ny = 2",
-        "\xEF\xBB\xBF[A]\r\nx=1\nmixed\r\n\r\n",
-        "junk\x01\xFF\0line\r\r\n[unclosed\n=\n[]\n"s,
-        "preamble=1\n  [ Loop 1 ] trailing\n\tRate = 5 \n",
-    };
-    for (const std::string& text : texts) {
+    for (const std::string& text :
+         {""s, "[A]\r\nx=1\r\n"s, "[A]\nx=1\n; note\n\n[B]\ny = 2"s,
+          "\xEF\xBB\xBF[A]\r\nx=1\nmixed\r\n\r\n"s, "junk\x01\xFF\0line\r\r\n[unclosed\n=\n[]\n"s,
+          "preamble=1\n  [ Loop 1 ] trailing\n\tRate = 5 \n"s}) {
         EXPECT_EQ(IniDocument::Parse(text).Serialise(), text);
     }
 }
 
 TEST(IniDocument, ReadsWhatWindowsFilesHold) {
     const auto document = IniDocument::Parse(
-        "top=0\r\n"
-        "[ Loop 1 ] ; title\r\n"
-        "  Rate  =  5  \r\n"
-        "quoted='  padded  '\r\n"
-        "double=\"x\"\r\n"
-        "half='x\r\n"
-        "inline=1 ; not a comment\r\n"
-        ";hidden=1\r\n"
-        "no equals sign\r\n"
-        "[Broken\r\n"
-        "after=broken\r\n"
-        "empty=\r\n"
-        "[a]b]\r\n"
-        "c=3\r\n");
+        "top=0\r\n[ Loop 1 ] ; title\r\n  Rate  =  5  \r\nquoted='  padded  '\r\ndouble=\"x\"\r\n"
+        "half='x\r\ninline=1 ; not a comment\r\n;hidden=1\r\nno equals sign\r\n[Broken\r\n"
+        "after=broken\r\nempty=\r\n[a]b]\r\nc=3\r\n[A]\nx=1\nx=2\n[a]\nx=3\ny=4\n");
     EXPECT_EQ(document.Value("loop 1", "RATE"), "5");
     EXPECT_EQ(document.Value(" Loop 1 ", " Rate "), "5");
     EXPECT_EQ(document.Value("Loop 1", "quoted"), "  padded  ");
@@ -59,64 +37,57 @@ TEST(IniDocument, ReadsWhatWindowsFilesHold) {
     EXPECT_EQ(document.Value("a]b", "c"), "3");
     EXPECT_EQ(document.Value("", "top"), std::nullopt);
     EXPECT_EQ(document.Value("Broken", "after"), std::nullopt);
-}
-
-TEST(IniDocument, DuplicateSectionsAndKeysReadAndWriteTheFirstEntry) {
-    const std::string text = "[A]\nx=1\nx=2\n\n[B]\nz=9\n\n[a]\nx=3\ny=4\n";
-    auto document = IniDocument::Parse(text);
-    EXPECT_EQ(document.Value("A", "x"), "1");
+    EXPECT_EQ(document.Value("A", "x"), "1") << "the first of duplicate keys and sections";
     EXPECT_EQ(document.Value("A", "y"), "4");
-
-    EXPECT_EQ(Edited(text, [](IniDocument& d) { d.SetValue("A", "x", "5"); }),
-              "[A]\nx=5\nx=2\n\n[B]\nz=9\n\n[a]\nx=3\ny=4\n");
-    EXPECT_EQ(Edited(text, [](IniDocument& d) { d.SetValue("A", "y", "5"); }),
-              "[A]\nx=1\nx=2\n\n[B]\nz=9\n\n[a]\nx=3\ny=5\n");
-    EXPECT_EQ(Edited(text, [](IniDocument& d) { d.SetValue("A", "w", "5"); }),
-              "[A]\nx=1\nx=2\nw=5\n\n[B]\nz=9\n\n[a]\nx=3\ny=4\n");
-    EXPECT_EQ(Edited(text, [](IniDocument& d) { EXPECT_TRUE(d.EraseKey("A", "X")); }),
-              "[A]\n\n[B]\nz=9\n\n[a]\ny=4\n");
-    EXPECT_EQ(Edited(text, [](IniDocument& d) { EXPECT_TRUE(d.EraseSection("a")); }),
-              "[B]\nz=9\n\n");
 }
 
-TEST(IniDocument, ReplacesAValueInPlace) {
-    EXPECT_EQ(Edited("[S]\r\n  Rate = 5 \r\nb=1\r\n",
-                     [](IniDocument& d) { EXPECT_TRUE(d.SetValue("s", "RATE", "10")); }),
-              "[S]\r\n  Rate = 10\r\nb=1\r\n");
-    EXPECT_EQ(Edited("[S]\nx=\n", [](IniDocument& d) { d.SetValue("S", "x", "1"); }), "[S]\nx=1\n");
-    auto document = IniDocument::Parse("[S]\nx=1\n");
-    EXPECT_FALSE(document.SetValue("S", "x", "1"));
-    EXPECT_FALSE(document.EraseKey("S", "y"));
+// One edit as the profile functions make it: no key erases the section, no value the key.
+struct Edit {
+    const char* before;
+    const char* section;
+    const char* key;
+    const char* value;
+    const char* after;
+};
+
+TEST(IniDocument, EditsPlaceAndRemoveLinesAsWindowsDoes) {
+    const char* twice = "[A]\nx=1\nx=2\n\n[B]\nz=9\n\n[a]\nx=3\ny=4\n";
+    const Edit edits[] = {
+        {twice, "A", "x", "5", "[A]\nx=5\nx=2\n\n[B]\nz=9\n\n[a]\nx=3\ny=4\n"},
+        {twice, "A", "y", "5", "[A]\nx=1\nx=2\n\n[B]\nz=9\n\n[a]\nx=3\ny=5\n"},
+        {twice, "A", "w", "5", "[A]\nx=1\nx=2\nw=5\n\n[B]\nz=9\n\n[a]\nx=3\ny=4\n"},
+        {twice, "A", "X", nullptr, "[A]\n\n[B]\nz=9\n\n[a]\ny=4\n"},
+        {twice, "a", nullptr, nullptr, "[B]\nz=9\n\n"},
+        {"[S]\r\n  Rate = 5 \r\nb=1\r\n", "s", "RATE", "10", "[S]\r\n  Rate = 10\r\nb=1\r\n"},
+        {"[S]\nx=\n", "S", "x", "1", "[S]\nx=1\n"},
+        {"", " New ", " key ", " v ", "[New]\r\nkey= v \r\n"},
+        {"[A]\nx=1\n; about B\n\n\n[B]\n", "A", "y", "2", "[A]\nx=1\n; about B\ny=2\n\n\n[B]\n"},
+        {"[A]\n\n[B]\n", "A", "y", "2", "[A]\ny=2\n\n[B]\n"},
+        {"[A]\nx=1", "A", "y", "2", "[A]\nx=1\ny=2\n"},
+        {"[A]\nx=1", "B", "y", "2", "[A]\nx=1\n\n[B]\ny=2\n"},
+        {"[A]\r\nx=1\r\n\r\n", "B", "y", "2", "[A]\r\nx=1\r\n\r\n[B]\r\ny=2\r\n"},
+        {"; only a comment", "B", "y", "2", "; only a comment\r\n\r\n[B]\r\ny=2\r\n"},
+        {"[A]\r\nx=1\r\n\r\n[B]\r\ny=2\r\n", "A", "x", nullptr, "[A]\r\n\r\n[B]\r\ny=2\r\n"},
+        {"[A]\r\nx=1\r\n\r\n[B]\r\ny=2\r\n; tail\r\n[C]\r\nz=3", "B", nullptr, nullptr,
+         "[A]\r\nx=1\r\n\r\n[C]\r\nz=3"},
+    };
+    for (const Edit& edit : edits) {
+        IniDocument document = IniDocument::Parse(edit.before);
+        const bool changed = edit.key == nullptr ? document.EraseSection(edit.section)
+                             : edit.value == nullptr
+                                 ? document.EraseKey(edit.section, edit.key)
+                                 : document.SetValue(edit.section, edit.key, edit.value);
+        EXPECT_TRUE(changed) << edit.before;
+        EXPECT_EQ(document.Serialise(), edit.after) << edit.before;
+    }
+}
+
+TEST(IniDocument, ReportsOnlyRealChangesAndKeepsTheRestIntact) {
+    auto document = IniDocument::Parse("[A]\nx=1\n[B]\ny=2\n[C]\nz=3\n");
+    EXPECT_FALSE(document.SetValue("A", "x", "1"));
+    EXPECT_FALSE(document.EraseKey("A", "y"));
     EXPECT_FALSE(document.EraseKey("T", "x"));
     EXPECT_FALSE(document.EraseSection("T"));
-}
-
-TEST(IniDocument, PlacesNewKeysAndSections) {
-    EXPECT_EQ(Edited("", [](IniDocument& d) { d.SetValue(" New ", " key ", " v "); }),
-              "[New]\r\nkey= v \r\n");
-    EXPECT_EQ(
-        Edited("[A]\nx=1\n; about B\n\n\n[B]\n", [](IniDocument& d) { d.SetValue("A", "y", "2"); }),
-        "[A]\nx=1\n; about B\ny=2\n\n\n[B]\n");
-    EXPECT_EQ(Edited("[A]\n\n[B]\n", [](IniDocument& d) { d.SetValue("A", "y", "2"); }),
-              "[A]\ny=2\n\n[B]\n");
-    EXPECT_EQ(Edited("[A]\nx=1", [](IniDocument& d) { d.SetValue("A", "y", "2"); }),
-              "[A]\nx=1\ny=2\n");
-    EXPECT_EQ(Edited("[A]\nx=1", [](IniDocument& d) { d.SetValue("B", "y", "2"); }),
-              "[A]\nx=1\n\n[B]\ny=2\n");
-    EXPECT_EQ(Edited("[A]\r\nx=1\r\n\r\n", [](IniDocument& d) { d.SetValue("B", "y", "2"); }),
-              "[A]\r\nx=1\r\n\r\n[B]\r\ny=2\r\n");
-    EXPECT_EQ(Edited("; only a comment", [](IniDocument& d) { d.SetValue("B", "y", "2"); }),
-              "; only a comment\r\n\r\n[B]\r\ny=2\r\n");
-}
-
-TEST(IniDocument, ErasingLeavesTheRestIntact) {
-    EXPECT_EQ(
-        Edited("[A]\r\nx=1\r\n\r\n[B]\r\ny=2\r\n", [](IniDocument& d) { d.EraseKey("A", "x"); }),
-        "[A]\r\n\r\n[B]\r\ny=2\r\n");
-    EXPECT_EQ(Edited("[A]\r\nx=1\r\n\r\n[B]\r\ny=2\r\n; tail\r\n[C]\r\nz=3",
-                     [](IniDocument& d) { d.EraseSection("B"); }),
-              "[A]\r\nx=1\r\n\r\n[C]\r\nz=3");
-    auto document = IniDocument::Parse("[A]\nx=1\n[B]\ny=2\n[C]\nz=3\n");
     document.EraseSection("A");
     document.SetValue("C", "w", "4");
     EXPECT_EQ(document.Value("B", "y"), "2");

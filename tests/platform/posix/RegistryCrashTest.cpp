@@ -5,20 +5,17 @@
 #include <gtest/gtest.h>
 
 #include <filesystem>
-#include <fstream>
 #include <random>
-#include <sstream>
 
 #include "platform/posix/FileRegistry.h"
 #include "platform/posix/RegistryFile.h"
+#include "platform/posix/TestFiles.h"
 #include "support/TempFolder.h"
 
 namespace cv::posix {
 namespace {
 
 using namespace platform;
-
-constexpr const char* kKey = "Software\\Stress";
 
 // Long enough that a replace takes a while, and checkable for tearing.
 std::string Pattern(int32_t lRound) {
@@ -36,7 +33,7 @@ std::string DwordBytes(int32_t lValue) {
 int32_t Put(FileRegistry& cRegistry, int32_t lRoot, const std::string& sName, int32_t lType,
             const std::string& sData) {
     RegistryApi::Key key = 0;
-    int32_t result = cRegistry.CreateKey(lRoot, kKey, kKeyAllAccess, key);
+    int32_t result = cRegistry.CreateKey(lRoot, "Software\\Stress", kKeyAllAccess, key);
     if (result == kErrorSuccess) {
         result = cRegistry.SetValue(key, sName, lType, sData);
         cRegistry.CloseKey(key);
@@ -61,35 +58,34 @@ int32_t Put(FileRegistry& cRegistry, int32_t lRoot, const std::string& sName, in
 
 // Reads one root's file strictly: it must be whole and undamaged.
 RegistryKey ReadWhole(const std::string& sPath) {
-    std::ifstream in(sPath, std::ios::binary);
-    std::ostringstream text;
-    text << in.rdbuf();
     bool damaged = true;
-    RegistryKey root = RegistryFile::Parse(text.str(), damaged);
+    RegistryKey root = RegistryFile::Parse(test::Slurp(sPath), damaged);
     EXPECT_FALSE(damaged) << sPath;
     return root;
 }
 
-int32_t DwordAt(const RegistryKey& cRoot, const std::string& sName) {
+std::string DataAt(const RegistryKey& cRoot, const std::string& sName, int32_t lType) {
     const RegistryKey* key = cRoot.Find({"Software", "Stress"});
     const RegistryValue* value = key == nullptr ? nullptr : key->Value(sName);
-    if (value == nullptr || value->Type != kRegDword || value->Data.size() != 4) {
+    if (value == nullptr || value->Type != lType) {
         ADD_FAILURE() << sName << " missing";
-        return -100;
+        return {};
     }
-    int32_t number = 0;
-    std::copy(value->Data.begin(), value->Data.end(), reinterpret_cast<char*>(&number));
+    return value->Data;
+}
+
+int32_t DwordAt(const RegistryKey& cRoot, const std::string& sName) {
+    const std::string data = DataAt(cRoot, sName, kRegDword);
+    int32_t number = -100;
+    EXPECT_EQ(data.size(), 4u) << sName;
+    std::copy_n(data.begin(), std::min<size_t>(data.size(), 4), reinterpret_cast<char*>(&number));
     return number;
 }
 
 int32_t PatternRound(const RegistryKey& cRoot) {
-    const RegistryValue* value = cRoot.Find({"Software", "Stress"})->Value("State");
-    if (value == nullptr) {
-        ADD_FAILURE() << "State missing";
-        return -100;
-    }
-    const int32_t round = std::stoi(value->Data.substr(6));
-    EXPECT_EQ(value->Data, Pattern(round)) << "a torn value";
+    const std::string data = DataAt(cRoot, "State", kRegSz);
+    const int32_t round = data.size() > 6 ? std::stoi(data.substr(6)) : -100;
+    EXPECT_EQ(data, Pattern(round)) << "a torn value";
     return round;
 }
 
@@ -151,36 +147,32 @@ TEST(RegistryCrash, AKilledWriterLeavesWholeFilesAndKeepsEveryReportedWrite) {
 
 TEST(RegistryCrash, TwoWritersOfOneStoreLoseNothingOfEachOther) {
     test::TempFolder folder;
-    constexpr int32_t kValues = 60;
     int go[2];
     ASSERT_EQ(::pipe(go), 0);
-    pid_t children[2];
     for (const char tag : {'A', 'B'}) {
-        const pid_t child = ::fork();
-        if (child == 0) {
+        if (::fork() == 0) {
             ::close(go[1]);
             char start = 0;
             FileRegistry registry(folder.Path());
             bool good = ::read(go[0], &start, 1) == 1;
-            for (int32_t i = 0; i < kValues && good; ++i) {
+            for (int32_t i = 0; i < 60 && good; ++i) {
                 good = Put(registry, kHkeyCurrentUser, tag + std::to_string(i), kRegDword,
                            DwordBytes(i)) == kErrorSuccess;
             }
             ::_exit(good ? 0 : 1);
         }
-        children[tag - 'A'] = child;
     }
     ASSERT_EQ(::write(go[1], "gg", 2), 2);
     ::close(go[1]);
     ::close(go[0]);
-    for (const pid_t child : children) {
-        int status = 0;
-        ::waitpid(child, &status, 0);
-        EXPECT_TRUE(WIFEXITED(status) && WEXITSTATUS(status) == 0);
+    for (int child = 0; child < 2; ++child) {
+        int status = -1;
+        ::wait(&status);
+        EXPECT_EQ(status, 0);
     }
     const RegistryKey root = ReadWhole(folder.File(FileRegistry::kCurrentUserFile));
     for (const char tag : {'A', 'B'}) {
-        for (int32_t i = 0; i < kValues; ++i) {
+        for (int32_t i = 0; i < 60; ++i) {
             EXPECT_EQ(DwordAt(root, tag + std::to_string(i)), i);
         }
     }

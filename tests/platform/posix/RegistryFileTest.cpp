@@ -19,15 +19,7 @@ std::vector<std::string> Path(const std::string& sPath) {
     return names;
 }
 
-const RegistryValue* ValueAt(const RegistryKey& cRoot, const std::string& sPath,
-                             const std::string& sName) {
-    const RegistryKey* key = cRoot.Find(Path(sPath));
-    return key == nullptr ? nullptr : key->Value(sName);
-}
-
-std::string Header() {
-    return std::string(RegistryFile::kFirstLine) + "\n";
-}
+const std::string kHeader = std::string(RegistryFile::kFirstLine) + "\n";
 
 TEST(RegistryFile, WritesAReadableTextThatReadsBackExactly) {
     RegistryKey root;
@@ -39,7 +31,7 @@ TEST(RegistryFile, WritesAReadableTextThatReadsBackExactly) {
     root.Make(Path("Software\\Empty"));
 
     const std::string text = RegistryFile::Write(root, "HKEY_CURRENT_USER");
-    EXPECT_EQ(text, Header() +
+    EXPECT_EQ(text, kHeader +
                         "; HKEY_CURRENT_USER\n"
                         "\n[Software\\Corvalent\\TestClient]\n"
                         "\"ServerID\"=\"\\\\\\\\PLANT1\\\\Vendor.Server.1\"\n"
@@ -78,7 +70,7 @@ TEST(RegistryFile, KeepsEveryByteTypeAndNameThroughARoundTrip) {
 }
 
 TEST(RegistryFile, ReadsHandEditedFiles) {
-    const std::string text = "\xEF\xBB\xBF" + Header() +
+    const std::string text = "\xEF\xBB\xBF" + kHeader +
                              "; comment\r\n"
                              "  [Software\\App]  \r\n"
                              "  \"A\" = \"1\"  \r\n"
@@ -112,22 +104,11 @@ TEST(RegistryFile, SortsSubKeysAsWindowsDoes) {
     EXPECT_EQ(root.SubKey(5), nullptr);
 }
 
-TEST(RegistryFile, AFileOfAnotherKindIsDamagedAsAWhole) {
-    bool damaged = false;
-    EXPECT_EQ(RegistryFile::Parse("", damaged).SubKeyCount(), 0u);
-    EXPECT_FALSE(damaged);
-    const RegistryKey root = RegistryFile::Parse("[Software\\X]\n\"a\"=\"1\"\n", damaged);
-    EXPECT_TRUE(damaged);
-    EXPECT_EQ(root.SubKeyCount(), 0u);
-    RegistryFile::Parse(std::string(RegistryFile::kFirstLine) + " 2\n", damaged);
-    EXPECT_TRUE(damaged);
-}
-
-TEST(RegistryFile, BadLinesCostOnlyThemselves) {
+TEST(RegistryFile, BadLinesCostOnlyThemselvesButAFileOfAnotherKindIsDamagedAsAWhole) {
     const std::string junk = "\x01\x02\xff\xfe binary\0junk\0"s;
     const std::string text =
-        Header() + "[Good\\One]\n\"kept\"=\"1\"\n" + "[Broken\\Key\n\"lost\"=\"2\"\n" + junk +
-        "\n" + "\"orphan\"=\"3\"\n" + "[Good\\Two]\n" + "\"raw nul\"=\"a\0b\"\n"s +
+        kHeader + "[Good\\One]\n\"kept\"=\"1\"\n" + "[Broken\\Key\n\"lost\"=\"2\"\n" + junk + "\n" +
+        "\"orphan\"=\"3\"\n" + "[Good\\Two]\n" + "\"raw nul\"=\"a\0b\"\n"s +
         "\"bad escape\"=\"\\q\"\n" + "\"bad dword\"=dword:123456789\n" +
         "\"bad hex\"=hex(3):1,2\n" + "\"trailing\"=\"x\" y\n" + "\"long\"=\"" +
         std::string(10 << 20, 'L') + "\"\n" + "\"big\"=\"" + std::string(300, 'x') + "\"\n" +
@@ -135,7 +116,7 @@ TEST(RegistryFile, BadLinesCostOnlyThemselves) {
     bool damaged = false;
     const RegistryKey root = RegistryFile::Parse(text, damaged);
     EXPECT_TRUE(damaged);
-    EXPECT_EQ(*ValueAt(root, "Good\\One", "kept"), Text("1"));
+    EXPECT_EQ(*root.Find(Path("Good\\One"))->Value("kept"), Text("1"));
     EXPECT_EQ(root.Find(Path("Broken")), nullptr);
     const RegistryKey* two = root.Find(Path("Good\\Two"));
     ASSERT_NE(two, nullptr);
@@ -143,6 +124,13 @@ TEST(RegistryFile, BadLinesCostOnlyThemselves) {
     EXPECT_EQ(two->Value("long")->Data.size(), (10u << 20) + 1);
     EXPECT_EQ(*two->Value("big"), Text(std::string(300, 'x')));
     EXPECT_EQ(root.SubKeyCount(), 1u) << "nothing under a malformed key line";
+
+    EXPECT_EQ(RegistryFile::Parse("", damaged).SubKeyCount(), 0u);
+    EXPECT_FALSE(damaged);
+    EXPECT_EQ(RegistryFile::Parse("[Software\\X]\n\"a\"=\"1\"\n", damaged).SubKeyCount(), 0u);
+    EXPECT_TRUE(damaged);
+    RegistryFile::Parse(std::string(RegistryFile::kFirstLine) + " 2\n", damaged);
+    EXPECT_TRUE(damaged);
 }
 
 TEST(RegistryFile, KeepsToWindowsLimitsOnNamesAndDepth) {
@@ -159,9 +147,9 @@ TEST(RegistryFile, KeepsToWindowsLimitsOnNamesAndDepth) {
     EXPECT_FALSE(RegistryKey::SplitPath(deep + "\\k", names));
 
     bool damaged = false;
-    RegistryFile::Parse(Header() + "[" + deep + "]\n", damaged);
+    RegistryFile::Parse(kHeader + "[" + deep + "]\n", damaged);
     EXPECT_FALSE(damaged);
-    const RegistryKey root = RegistryFile::Parse(Header() + "[" + deep + "\\k]\n", damaged);
+    const RegistryKey root = RegistryFile::Parse(kHeader + "[" + deep + "\\k]\n", damaged);
     EXPECT_TRUE(damaged);
     EXPECT_EQ(root.SubKeyCount(), 0u);
 }
