@@ -8,7 +8,7 @@ class HelpWindowTest : public QObject {
     Q_OBJECT
 
   private slots:
-    void showsBundledTopicsInOneWindow() {
+    void showsBundledTopicsNamedByContextNumberInOneWindow() {
         HelpWindow help;
         QVERIFY(help.Window() == nullptr);
         help.ShowTopic("/opt/cv/CvOpcTestClient.hlp>StepsSub", 1);
@@ -27,9 +27,7 @@ class HelpWindowTest : public QObject {
         QCOMPARE(help.Window(), window);
         QVERIFY(window->isVisible());
         QVERIFY(window->toPlainText().contains(QStringLiteral("Test read")));
-    }
 
-    void topicsAreNamedByContextNumber() {
         QCOMPARE(HelpWindow::TopicPath(407), QStringLiteral(":/help/topic407.html"));
         QVERIFY(QFile::exists(HelpWindow::TopicPath(1)));
     }
