@@ -4,6 +4,7 @@
 
 #include <fstream>
 #include <limits>
+#include <tuple>
 
 #include "document/TunFile.h"
 #include "support/TestPlatform.h"
@@ -40,8 +41,7 @@ TEST(LoopClass, UnitRulesOrsiDetectionAndCopy) {
     loop.SetdUnits("s");
     EXPECT_EQ(loop.FilterUnitsString(), "seconds");  // "Same As D"
     loop.SetFilterUnits("Hertz");
-    EXPECT_EQ(loop.FilterUnitsLong(), 3);
-    EXPECT_EQ(loop.FilterUnitsString(), "hertz");
+    EXPECT_EQ(std::tuple(loop.FilterUnitsLong(), loop.FilterUnitsString()), std::tuple(3, "hertz"));
     loop.SetFilterUnits("hertz");
     EXPECT_EQ(loop.FilterUnits(), "Same As D");
     loop.SetControllerString("orsi loop 12");
@@ -61,68 +61,51 @@ TEST(LoopClass, UnitRulesOrsiDetectionAndCopy) {
     LoopClass copy(tp.platform);
     copy.CopyFrom(&loop);
     copy.CopyFrom(nullptr);
-    EXPECT_EQ(copy.SPChannel(), 9);
-    EXPECT_TRUE(copy.OrsiLoop());
-    EXPECT_EQ(copy.FilterUnits(), "Minutes");
-    EXPECT_EQ(copy.Number(), 1);
-    EXPECT_EQ(copy.Control(), 1);
-    EXPECT_EQ(copy.CurrentP(), 0.0);
-    EXPECT_FALSE(copy.UnFilterPV());
+    EXPECT_EQ(std::tuple(copy.SPChannel(), copy.OrsiLoop(), copy.FilterUnits()),
+              std::tuple(9, true, "Minutes"));
+    EXPECT_EQ(std::tuple(copy.Number(), copy.Control(), copy.CurrentP(), copy.UnFilterPV()),
+              std::tuple(1, 1, 0.0, false));
     EXPECT_TRUE(tp.dialogs.Messages().empty());
-}
-
-TEST(LoopClass, FaceplateLoopKeepsItsChannelsAndSettings) {
-    LoopFile f(9,
-               "[PIDController Loop 1]\nPVChannel=7\nSPChannel=8\nCurrentP=3\nCurrentD=4\n"
-               "Description=Boiler\nUnFilterPV=1\n");
-    LoopClass loop(f.tp.platform);
-    loop.SetCurrentD(2.0);
-    loop.ReadFromDisk(f.tunFile);
-    EXPECT_EQ(loop.PVChannel(), 1);
-    EXPECT_EQ(loop.SPChannel(), 3);
-    EXPECT_EQ(loop.CurrentP(), 0.0);
-    EXPECT_EQ(loop.CurrentD(), 0.0);
-    EXPECT_EQ(loop.Description(), "Boiler");
-    EXPECT_TRUE(loop.UnFilterPV());
-
-    LoopFile noFaceplate(5, "[PIDController Loop 1]\nPVChannel=7\nCurrentP=3\n");
-    LoopClass other(noFaceplate.tp.platform);
-    other.ReadFromDisk(noFaceplate.tunFile);
-    EXPECT_EQ(other.PVChannel(), 7);
-    EXPECT_EQ(other.SPChannel(), 0);
-    EXPECT_EQ(other.CurrentP(), 3.0);
-    EXPECT_EQ(other.Description(), "New Loop");
 }
 
 TEST(LoopClass, ReadsALoopSectionWithItsDefaultsAndRules) {
     LoopFile f(9,
+               "[PIDController Loop 1]\nPVChannel=7\nSPChannel=8\nCurrentP=3\nCurrentD=4\n"
+               "Description=Boiler\nUnFilterPV=1\n"
                "[PIDController Loop 2]\nintegral_units=3\nresponse_direction=5\n"
                "pb_or_gain=2\nPB_multiplier=0.1\nDerivative_multiplier=1e300\n"
                "controller_type=2\nCurrentI=1.5\nInverseProcess=-1\n");
+    LoopClass faceplate(f.tp.platform);  // keeps its channels and has no state
+    faceplate.SetCurrentD(2.0);
+    faceplate.ReadFromDisk(f.tunFile);
+    EXPECT_EQ(std::tuple(faceplate.PVChannel(), faceplate.SPChannel(), faceplate.CurrentP(),
+                         faceplate.CurrentD(), faceplate.Description(), faceplate.UnFilterPV()),
+              std::tuple(1, 3, 0.0, 0.0, "Boiler", true));
+
     LoopClass loop(f.tp.platform);
     loop.SetNumber(2);
     loop.SetFilterUnits("Hertz");
     loop.ReadFromDisk(f.tunFile);
-    EXPECT_EQ(loop.PVChannel(), 1);
-    EXPECT_EQ(loop.COChannel(), 2);
-    EXPECT_EQ(loop.SPChannel(), 0);
-    EXPECT_EQ(loop.IntegralUnits(), 3);
-    EXPECT_EQ(loop.DUnitsString(), "seconds");
-    EXPECT_EQ(loop.ResponseDirection(), 1);
-    EXPECT_EQ(loop.PBorGain(), 2);
-    EXPECT_EQ(loop.PMultiplier(), static_cast<double>(0.1f));
-    EXPECT_EQ(loop.IMultiplier(), 1.0);
-    EXPECT_EQ(loop.DMultiplier(), std::numeric_limits<float>::max());
-    EXPECT_EQ(loop.ControllerString(), "Parallel");
-    EXPECT_EQ(loop.CurrentI(), 1.5);
-    EXPECT_TRUE(loop.InverseProcess());
-    EXPECT_EQ(loop.FilterUnits(), "Hertz");  // missing: keeps its own
+    EXPECT_EQ(std::tuple(loop.PVChannel(), loop.COChannel(), loop.SPChannel(), loop.IntegralUnits(),
+                         loop.DUnitsString(), loop.ResponseDirection(), loop.PBorGain(),
+                         loop.ControllerString()),
+              std::tuple(1, 2, 0, 3, "seconds", 1, 2, "Parallel"));
+    EXPECT_EQ(std::tuple(loop.PMultiplier(), loop.IMultiplier(), loop.DMultiplier()),
+              std::tuple(static_cast<double>(0.1f), 1.0, std::numeric_limits<float>::max()));
+    EXPECT_EQ(std::tuple(loop.CurrentI(), loop.InverseProcess(), loop.FilterUnits()),
+              std::tuple(1.5, true, "Hertz"));  // a missing filter unit keeps its own
 
-    LoopFile plain(9, "[PIDController Loop 2]\ncontroller_type=7\n");
-    plain.tunFile.SetTunerType(10);
+    LoopFile plain(10, "[PIDController Loop 2]\ncontroller_type=7\n");
     loop.ReadFromDisk(plain.tunFile);
-    EXPECT_EQ(loop.ControllerString(), "Wrong Simulation");
-    EXPECT_EQ(loop.dUnits(), "min");
+    EXPECT_EQ(std::tuple(loop.ControllerString(), loop.dUnits()),
+              std::tuple("Wrong Simulation", "min"));
+
+    LoopFile noFaceplate(5, "[PIDController Loop 1]\nPVChannel=7\nCurrentP=3\n");
+    LoopClass other(noFaceplate.tp.platform);
+    other.ReadFromDisk(noFaceplate.tunFile);
+    EXPECT_EQ(
+        std::tuple(other.PVChannel(), other.SPChannel(), other.CurrentP(), other.Description()),
+        std::tuple(7, 0, 3.0, "New Loop"));
 }
 
 TEST(LoopClass, WrittenLoopReadsBackWithTheStateOnlyFromWriteCurrentPIDF) {
@@ -145,15 +128,11 @@ TEST(LoopClass, WrittenLoopReadsBackWithTheStateOnlyFromWriteCurrentPIDF) {
     LoopClass back(f.tp.platform);
     back.SetNumber(2);
     back.ReadFromDisk(f.tunFile);
-    EXPECT_EQ(back.Description(), "Steam flow");
-    EXPECT_EQ(back.SPChannel(), 6);
-    EXPECT_EQ(back.ResponseDirection(), -1);
-    EXPECT_EQ(back.dUnits(), "sec");
-    EXPECT_EQ(back.ControllerSI(), 0.2);
-    EXPECT_EQ(back.FilterUnits(), "Seconds");
-    EXPECT_EQ(back.CurrentP(), 12.5);
-    EXPECT_TRUE(back.UnFilterPV());
-    EXPECT_EQ(back.ControllerString(), "Corvalent Simulation");
+    EXPECT_EQ(std::tuple(back.Description(), back.SPChannel(), back.ResponseDirection(),
+                         back.dUnits(), back.ControllerSI(), back.FilterUnits()),
+              std::tuple("Steam flow", 6, -1, "sec", 0.2, "Seconds"));
+    EXPECT_EQ(std::tuple(back.CurrentP(), back.UnFilterPV(), back.ControllerString()),
+              std::tuple(12.5, true, "Corvalent Simulation"));
 
     // Another kind's simulation controller; the faceplate loop keeps no state.
     LoopFile wrong(11);

@@ -4,6 +4,7 @@
 
 #include <fstream>
 #include <sstream>
+#include <tuple>
 
 #include "document/TunFile.h"
 #include "support/TestPlatform.h"
@@ -36,15 +37,23 @@ struct LoopsFile {
     }
 };
 
-TEST(LoopCollection, RemoveRenumbersAndLowersTheCurrentLoop) {
+TEST(LoopCollection, CopyIsDeepAndRemoveRenumbersAndLowersTheCurrentLoop) {
     LoopsFile f;
     EXPECT_EQ(f.loops.CurrentLoop(), 0);
     f.AddLoops(3);
     EXPECT_EQ(f.loops.CurrentLoop(), 1);
     f.loops.Item(3)->SetPVChannel(7);
+    f.loops.Item(3)->SetControl(3);
     f.loops.SetCurrentLoop(3);
     f.loops.SetCurrentLoop(5);
     EXPECT_EQ(f.loops.CurrentLoop(), 3);
+
+    std::unique_ptr<LoopCollection> copy = f.loops.Copy();
+    EXPECT_EQ(std::tuple(copy->Count(), copy->CurrentLoop(), copy->Item(3)->Number(),
+                         copy->PVChannelNumber(3), copy->Item(3)->Control()),
+              std::tuple(3, 3, 3, 7, 1));
+    copy->Item(1)->SetDescription("Changed");
+    EXPECT_EQ(f.loops.Item(1)->Description(), "New Loop");
 
     LoopClass* second = f.loops.Item(2);
     f.loops.Remove(second);
@@ -64,25 +73,6 @@ TEST(LoopCollection, RemoveRenumbersAndLowersTheCurrentLoop) {
         f.loops.Remove(first);
     }
     EXPECT_EQ(f.loops.CurrentLoop(), 0);
-}
-
-TEST(LoopCollection, CopyIsDeepAndKeepsTheCurrentLoop) {
-    LoopsFile f;
-    f.loops.SetDefaults();
-    f.AddLoops(1);
-    f.loops.Item(2)->SetDescription("Second");
-    f.loops.Item(2)->SetControl(3);
-    f.loops.SetCurrentLoop(2);
-    EXPECT_EQ(f.loops.Item(1)->Description(), "Faceplate");
-
-    std::unique_ptr<LoopCollection> copy = f.loops.Copy();
-    ASSERT_EQ(copy->Count(), 2);
-    EXPECT_EQ(copy->CurrentLoop(), 2);
-    EXPECT_EQ(
-        std::tuple(copy->Item(2)->Number(), copy->Item(2)->Description(), copy->Item(2)->Control()),
-        std::tuple(2, "Second", 1));
-    copy->Item(1)->SetDescription("Changed");
-    EXPECT_EQ(f.loops.Item(1)->Description(), "Faceplate");
 }
 
 TEST(LoopCollection, LoopCountComesFromTheFileAndTheKind) {
