@@ -68,10 +68,10 @@ TEST_F(OpcChannel, UncertainWarningOncePerChannelAndNoSilencesAll) {
     EXPECT_EQ(tp.dialogs.Messages().size(), 1u);
 
     // Other channels ask once each, over HDA too, until one is answered No.
-    auto uncertain = [&](int32_t lQuality) {
+    auto uncertain = [&](int32_t lQuality, bool bNumber = false) {
         auto other = std::make_unique<Channel>(tp.platform);
         other->SetComType(ComTypeCode::Opc);
-        other->SetExpectANumber(false);
+        other->SetExpectANumber(bNumber);
         other->OpcSetRawValue(Variant::R8(1), lQuality, 0, false);
         return other;
     };
@@ -87,7 +87,7 @@ TEST_F(OpcChannel, UncertainWarningOncePerChannelAndNoSilencesAll) {
     ASSERT_EQ(tp.dialogs.Messages().size(), 3u);
     EXPECT_NE(tp.dialogs.Last().text.find("\"Uncertain value - Last usable\""), std::string::npos);
     EXPECT_TRUE(tp.run.UncertainWarningOff);
-    uncertain(kUncertain)->RawValue();
+    uncertain(kUncertain, true)->RawValue();
     EXPECT_EQ(tp.dialogs.Messages().size(), 3u);
 }
 
