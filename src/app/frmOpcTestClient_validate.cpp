@@ -103,6 +103,9 @@ bool frmOpcTestClient::Validate(QWidget* field) {
 bool frmOpcTestClient::ValidateRangeBox(QLineEdit& box, const std::string& sSpanName,
                                         RangeType eRange, bool bIsMax, double dOtherLimit) {
     const float v = TextToSingle(mPlatform, box.text().toStdString());
+    // Whatever was typed, the box then shows the number read from it, so a
+    // text read only in part ("1e60", "12,5") never stands for another value.
+    box.setText(QString::fromStdString(RangeText(v)));
     // The box shows single-precision numbers, so the held limit is compared
     // at that precision.
     if (v == static_cast<float>(TestChannel().GetRangeValue(eRange, bIsMax ? 1 : 0))) {
@@ -110,12 +113,11 @@ bool frmOpcTestClient::ValidateRangeBox(QLineEdit& box, const std::string& sSpan
     }
     const double dMin = bIsMax ? dOtherLimit : v;
     const double dMax = bIsMax ? v : dOtherLimit;
-    if (CheckMinMax(dMin, dMax, sSpanName)) {
-        TestChannel().SetRange(eRange, dMin, dMax);
-        return true;
+    if (!CheckMinMax(dMin, dMax, sSpanName)) {
+        return false;
     }
-    box.setText(QString::fromStdString(RangeText(v)));
-    return false;
+    TestChannel().SetRange(eRange, dMin, dMax);
+    return true;
 }
 
 bool frmOpcTestClient::CheckMinMax(double dMin, double dMax, const std::string& sSpanName) {

@@ -232,6 +232,7 @@ class frmOpcTestClientTest : public QObject {
         QCOMPARE(Messages().size(), size_t{1});
         QCOMPARE(Messages()[0].title, std::string("Conversion errors"));
         QCOMPARE(Channel().InstMin(), double(1E-5F));
+        QCOMPARE(Box("txtInstMin")->text(), QStringLiteral("1E-05"));
         QVERIFY(std::isfinite(Channel().ScaleFactor()));
     }
 
