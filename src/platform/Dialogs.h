@@ -35,7 +35,7 @@ namespace platform {
 // Modal message boxes. Texts use CR LF line breaks; an empty title means the
 // program's default caption.
 class Dialogs {
-public:
+  public:
     virtual ~Dialogs() = default;
     virtual int32_t MsgBox(const std::string& text, int32_t style, const std::string& title) = 0;
 };

@@ -8,7 +8,7 @@ namespace cv::platform {
 // The window thread's event loop: a millisecond clock, timers and a way to
 // let pending events run while a long operation is under way.
 class EventLoop {
-public:
+  public:
     using TimerId = int32_t;
 
     virtual ~EventLoop() = default;

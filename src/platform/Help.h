@@ -8,7 +8,7 @@ namespace cv::platform {
 // Shows one topic of a help file, chosen by its context number. The file name
 // may carry a window name after ">".
 class Help {
-public:
+  public:
     virtual ~Help() = default;
     virtual void ShowTopic(const std::string& helpFile, int32_t context) = 0;
 };

@@ -8,7 +8,7 @@ namespace cv::platform {
 // hour/minute/second letters of the Windows control panel: "dd/MM/yyyy",
 // "HH:mm:ss", "h:mm:ss tt".
 class Locale {
-public:
+  public:
     virtual ~Locale() = default;
     virtual std::string DecimalSeparator() const = 0;
     virtual std::string GroupingSeparator() const = 0;

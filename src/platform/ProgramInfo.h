@@ -7,7 +7,7 @@ namespace cv::platform {
 
 // Facts about the running program: where it lives and its version resource.
 class ProgramInfo {
-public:
+  public:
     virtual ~ProgramInfo() = default;
     // Folder of the executable, without a trailing separator.
     virtual std::string Folder() const = 0;

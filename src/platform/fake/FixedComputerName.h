@@ -8,7 +8,7 @@
 namespace cv::fake {
 
 class FixedComputerName : public platform::ComputerName {
-public:
+  public:
     std::optional<std::string> name = "TESTPC";
 
     std::optional<std::string> Query() const override { return name; }

@@ -8,7 +8,7 @@ namespace cv::fake {
 
 // Regional settings pinned for tests.
 class FixedLocale : public platform::Locale {
-public:
+  public:
     FixedLocale(std::string decimal, std::string grouping, std::string longTime,
                 std::string shortDate)
         : decimal_(std::move(decimal)),
@@ -26,7 +26,7 @@ public:
     std::string LongTimeFormat() const override { return longTime_; }
     std::string ShortDateFormat() const override { return shortDate_; }
 
-private:
+  private:
     std::string decimal_;
     std::string grouping_;
     std::string longTime_;

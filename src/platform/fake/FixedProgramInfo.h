@@ -8,7 +8,7 @@ namespace cv::fake {
 
 // Program facts chosen by the test.
 class FixedProgramInfo : public platform::ProgramInfo {
-public:
+  public:
     std::string folder = "/opt/cvopctestclient";
     std::string fileName = "cvopctestclient";
     int32_t major = 13;

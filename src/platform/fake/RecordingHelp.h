@@ -9,7 +9,7 @@ namespace cv::fake {
 
 // Remembers which help topics were asked for.
 class RecordingHelp : public platform::Help {
-public:
+  public:
     struct Request {
         std::string file;
         int32_t context = 0;

@@ -11,7 +11,7 @@ namespace cv::fake {
 // Records every message box and answers from a queue. With the queue empty it
 // answers with the first button of the box (OK, Yes, Abort or Retry).
 class ScriptedDialogs : public platform::Dialogs {
-public:
+  public:
     struct Shown {
         std::string text;
         int32_t style = 0;
@@ -25,7 +25,7 @@ public:
     const Shown& Last() const { return shown_.back(); }
     void Clear() { shown_.clear(); }
 
-private:
+  private:
     std::deque<int32_t> answers_;
     std::vector<Shown> shown_;
 };

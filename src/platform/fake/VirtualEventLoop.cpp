@@ -14,9 +14,13 @@ platform::EventLoop::TimerId VirtualEventLoop::StartTimer(uint32_t intervalMs, b
     return id;
 }
 
-void VirtualEventLoop::StopTimer(TimerId id) { timers_.erase(id); }
+void VirtualEventLoop::StopTimer(TimerId id) {
+    timers_.erase(id);
+}
 
-void VirtualEventLoop::Post(std::function<void()> event) { posted_.push_back(std::move(event)); }
+void VirtualEventLoop::Post(std::function<void()> event) {
+    posted_.push_back(std::move(event));
+}
 
 void VirtualEventLoop::DoEvents() {
     ++doEventsCalls_;
@@ -44,7 +48,8 @@ void VirtualEventLoop::Advance(uint32_t ms) {
 bool VirtualEventLoop::FireNextDue(uint64_t until) {
     auto next = timers_.end();
     for (auto it = timers_.begin(); it != timers_.end(); ++it) {
-        if (it->second.due <= until && (next == timers_.end() || it->second.due < next->second.due)) {
+        if (it->second.due <= until &&
+            (next == timers_.end() || it->second.due < next->second.due)) {
             next = it;
         }
     }

@@ -13,7 +13,7 @@ namespace cv::fake {
 // order of their due time while the clock is advanced; posted events run on
 // DoEvents and whenever the clock is advanced.
 class VirtualEventLoop : public platform::EventLoop {
-public:
+  public:
     explicit VirtualEventLoop(uint32_t startMs = 0) : now_(startMs) {}
 
     uint32_t TimeGetTime() const override { return static_cast<uint32_t>(now_); }
@@ -28,7 +28,7 @@ public:
     int ActiveTimers() const { return static_cast<int>(timers_.size()); }
     int DoEventsCalls() const { return doEventsCalls_; }
 
-private:
+  private:
     struct Timer {
         uint64_t due = 0;
         uint32_t interval = 0;

@@ -17,14 +17,22 @@ PosixProgramInfo::PosixProgramInfo() {
     }
 }
 
-int32_t PosixProgramInfo::VersionMajor() const { return CV_VERSION_MAJOR; }
-int32_t PosixProgramInfo::VersionMinor() const { return CV_VERSION_MINOR; }
-int32_t PosixProgramInfo::VersionRevision() const { return CV_VERSION_REVISION; }
+int32_t PosixProgramInfo::VersionMajor() const {
+    return CV_VERSION_MAJOR;
+}
+int32_t PosixProgramInfo::VersionMinor() const {
+    return CV_VERSION_MINOR;
+}
+int32_t PosixProgramInfo::VersionRevision() const {
+    return CV_VERSION_REVISION;
+}
 
 std::string PosixProgramInfo::LegalNotice() const {
     return "Copyright \xC2\xA9 2026 Corvalent. All rights reserved.";
 }
 
-std::string PosixProgramInfo::DataFolder() const { return XdgFolder("XDG_DATA_HOME", ".local/share"); }
+std::string PosixProgramInfo::DataFolder() const {
+    return XdgFolder("XDG_DATA_HOME", ".local/share");
+}
 
 }  // namespace cv::posix

@@ -9,7 +9,7 @@ namespace cv::posix {
 // The running executable's folder and name (from /proc/self/exe), the version
 // the build was given, and the XDG data folder.
 class PosixProgramInfo : public platform::ProgramInfo {
-public:
+  public:
     PosixProgramInfo();
 
     std::string Folder() const override { return folder_; }
@@ -20,7 +20,7 @@ public:
     std::string LegalNotice() const override;
     std::string DataFolder() const override;
 
-private:
+  private:
     std::string folder_;
     std::string fileName_;
 };
