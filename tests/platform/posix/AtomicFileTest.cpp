@@ -8,8 +8,8 @@
 
 #include <filesystem>
 
-#include "platform/posix/TestFiles.h"
 #include "support/TempFolder.h"
+#include "support/TestFiles.h"
 
 namespace cv::posix {
 namespace {

@@ -9,8 +9,8 @@
 
 #include "platform/posix/FileRegistry.h"
 #include "platform/posix/RegistryFile.h"
-#include "platform/posix/TestFiles.h"
 #include "support/TempFolder.h"
+#include "support/TestFiles.h"
 
 namespace cv::posix {
 namespace {
