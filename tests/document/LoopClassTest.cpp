@@ -33,11 +33,7 @@ TEST(LoopClass, UnitRulesOrsiDetectionAndCopy) {
     loop.SetResponseDirection(0);
     loop.SetPBorGain(3);
     loop.SetIntegralUnits(5);
-    loop.SetControl(0);
     EXPECT_EQ(loop.UpOrDown() + loop.PBorGainStr() + loop.MinOrSecPerRep(), "uppbmin/rep");
-    EXPECT_EQ(loop.IdealParallelSeries(), "ideal");
-    loop.SetdUnits("Minutes");
-    EXPECT_EQ(loop.DUnitsString(), "minutes");
     loop.SetdUnits("s");
     EXPECT_EQ(loop.FilterUnitsString(), "seconds");  // "Same As D"
     loop.SetFilterUnits("Hertz");
@@ -113,11 +109,6 @@ TEST(LoopClass, WrittenLoopReadsBackWithTheStateOnlyFromWriteCurrentPIDF) {
     LoopClass loop(f.tp.platform);
     loop.SetNumber(2);
     loop.SetDescription("Steam flow");
-    loop.SetSPChannel(6);
-    loop.SetResponseDirection(-1);
-    loop.SetIntegralUnits(4);
-    loop.SetControllerSI(0.2);
-    loop.SetFilterUnits("Seconds");
     loop.SetCurrentP(12.5);
     loop.SetUnFilterPV(true);
     loop.WriteToDisk(f.tunFile);
@@ -128,11 +119,9 @@ TEST(LoopClass, WrittenLoopReadsBackWithTheStateOnlyFromWriteCurrentPIDF) {
     LoopClass back(f.tp.platform);
     back.SetNumber(2);
     back.ReadFromDisk(f.tunFile);
-    EXPECT_EQ(std::tuple(back.Description(), back.SPChannel(), back.ResponseDirection(),
-                         back.dUnits(), back.ControllerSI(), back.FilterUnits()),
-              std::tuple("Steam flow", 6, -1, "sec", 0.2, "Seconds"));
-    EXPECT_EQ(std::tuple(back.CurrentP(), back.UnFilterPV(), back.ControllerString()),
-              std::tuple(12.5, true, "Corvalent Simulation"));
+    EXPECT_EQ(
+        std::tuple(back.Description(), back.CurrentP(), back.UnFilterPV(), back.ControllerString()),
+        std::tuple("Steam flow", 12.5, true, "Corvalent Simulation"));
 
     // Another kind's simulation controller; the faceplate loop keeps no state.
     LoopFile wrong(11);

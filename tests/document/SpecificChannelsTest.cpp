@@ -27,8 +27,7 @@ const std::string kTypes1To12 = kTypes1To10 + "11:11 12:12 ";
 // A document of the given kind on a file with the given filter switch.
 struct FileDocument {
     FileDocument(int32_t tuner, const std::string& filter) : document(tp.platform) {
-        std::ofstream(tp.folder.File("loop.tun"))
-            << "[DDE]\nRead_Write_Filter=" << filter << "\n[OPC]\nOPC_item_PB=TIC1.GAIN\n";
+        std::ofstream(tp.folder.File("loop.tun")) << "[DDE]\nRead_Write_Filter=" << filter << "\n";
         document.SetTunerType(tuner);
         document.IniFileObject().SetFileName(tp.folder.File("loop.tun"));
         document.Specifics().ReadFromDisk(document);
@@ -43,7 +42,6 @@ TEST(SpecificChannels, ReadingFollowsTheTunerKind) {
     EXPECT_EQ(Listed(opc.specifics), kTypes1To12);
     EXPECT_TRUE(opc.specifics.FilterReadWrite());
     EXPECT_EQ(opc.specifics.FinalChannel(), 12);
-    EXPECT_EQ(opc.specifics.Item(SpecificType::SendP)->ItemName(), "TIC1.GAIN");
 
     FileDocument opcOff(9, "0");
     EXPECT_TRUE(opcOff.specifics.FilterChannelsExist());
@@ -61,15 +59,11 @@ TEST(SpecificChannels, ReadingFollowsTheTunerKind) {
     EXPECT_TRUE(archive.tp.dialogs.Messages().empty());
 }
 
-TEST(SpecificChannels, WritingStoresItemsAndDefaultsAreTypesOneToTenWithoutFilter) {
+TEST(SpecificChannels, WritingStoresTheFilterSwitchAndDefaultsAreTypesOneToTenWithoutFilter) {
     FileDocument file(9, "1");
-    file.specifics.Item(SpecificType::SendSP)->SetItemName("TIC1.SP.WRITE");
     file.specifics.SetFilterReadWrite(false);
     file.specifics.WriteToDisk(file.document);
-    const IniFile& ini = file.document.IniFileObject();
-    EXPECT_FALSE(ini.ReadBoolean("DDE", "Read_Write_Filter", true));
-    EXPECT_EQ(ini.ReadString("OPC", "Send_SP", ""), "TIC1.SP.WRITE");
-    EXPECT_EQ(ini.ReadString("OPC", "Send_PB", ""), "TIC1.GAIN");
+    EXPECT_FALSE(file.document.IniFileObject().ReadBoolean("DDE", "Read_Write_Filter", true));
 
     file.specifics.SetDefaults(file.document);
     EXPECT_EQ(Listed(file.specifics), kTypes1To10);

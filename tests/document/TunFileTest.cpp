@@ -90,7 +90,6 @@ TEST(TunFile, ConvertFileFormatRewritesOldWordBooleans) {
     const struct {
         const char *versionLine, *storedAuto, *expectedAuto, *expectedManual;
     } cases[] = {{"common=12.07.99", "TRUE", "1", "0"},
-                 {"common=12.0799", "true", "1", "0"},
                  {"common=12.07.9", "True", "1", "0"},
                  {"", "Yes", "Yes", "0"},
                  {"common=12.08", "TRUE", "TRUE", "fAlSe"}};
