@@ -3,7 +3,6 @@
 #include <QLineEdit>
 #include <QListWidget>
 #include <QPushButton>
-#include <QScreen>
 #include <QtTest>
 
 #include "app/FormUtility.h"
@@ -59,22 +58,6 @@ class FormUtilityTest : public QObject {
         QCOMPARE(cv::FindListEntry(list, "cherry", 0), int16_t{1});
         QCOMPARE(cv::FindListEntry(list, "a", 1), int16_t{0});
         QCOMPARE(cv::FindListEntry(list, "zucchini", 0), int16_t{-1});
-    }
-
-    void centresOnTheScreen() {
-        QWidget form;
-        form.resize(200, 100);
-        form.show();
-        QVERIFY(QTest::qWaitForWindowExposed(&form));
-        const QRect screen = form.screen()->geometry();
-        const QSize size = form.frameGeometry().size();
-        cv::CenterForm(form, 0);
-        QCOMPARE(form.frameGeometry().topLeft(),
-                 QPoint(screen.left() + screen.width() / 2 - size.width() / 2,
-                        screen.top() + screen.height() / 2 - size.height() / 2));
-        const QPoint centred = form.frameGeometry().topLeft();
-        cv::CenterForm(form, 30);
-        QCOMPARE(form.frameGeometry().topLeft(), centred + QPoint(30, 30));
     }
 };
 

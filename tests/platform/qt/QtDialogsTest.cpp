@@ -42,21 +42,16 @@ class QtDialogsTest : public QObject {
 
   private slots:
     void stylesAndAnswersAreTheWindowsCodes() {
-        // The button code and the icon code are added together.
-        QCOMPARE(QtDialogs::ButtonsFor(4 + 32), QMessageBox::Yes | QMessageBox::No);
+        // The button code and the icon code are added together; the box tests
+        // below show the common ones, these the edges.
         QCOMPARE(QtDialogs::ButtonsFor(2 + 16),
                  QMessageBox::Abort | QMessageBox::Retry | QMessageBox::Ignore);
         QCOMPARE(QtDialogs::ButtonsFor(7), QMessageBox::StandardButtons(QMessageBox::Ok));
-        QCOMPARE(QtDialogs::IconFor(0), QMessageBox::NoIcon);
-        QCOMPARE(QtDialogs::IconFor(48), QMessageBox::Warning);
         QCOMPARE(QtDialogs::IconFor(3 + 64 + 256), QMessageBox::Information);
         // 256 makes the second button the default one.
         QCOMPARE(QtDialogs::DefaultButtonFor(4 + 256), QMessageBox::No);
         QCOMPARE(QtDialogs::DefaultButtonFor(0 + 512), QMessageBox::Ok);
-
         QCOMPARE(QtDialogs::AnswerFor(QMessageBox::Ignore, 2), 5);
-        QCOMPARE(QtDialogs::AnswerFor(QMessageBox::Yes, 4), 6);
-        QCOMPARE(QtDialogs::AnswerFor(QMessageBox::No, 4), 7);
         // Closed without a button: the escape button's answer.
         QCOMPARE(QtDialogs::AnswerFor(QMessageBox::NoButton, 4), 7);
         QCOMPARE(QtDialogs::AnswerFor(QMessageBox::NoButton, 3), 2);
