@@ -38,7 +38,6 @@ TEST_F(FileProfilesTest, BareNamesLiveInTheOwnersSettingsFolder) {
     const std::string file = config_ + "/Corvalen.ini";
     EXPECT_EQ(Slurp(file), "[Faceplate]\r\nWriteDisabled=1\r\n");
     EXPECT_EQ(test::ModeOf(file), 0600u);
-    EXPECT_EQ(test::ModeOf(config_), 0700u);
 
     EXPECT_TRUE(
         profiles_.WritePrivateProfileString("Faceplate", "Colour"s, "255"s, "CORVALEN.Ini"));

@@ -143,8 +143,6 @@ TEST(FileRegistry, CreatesPrivateFilesOnlyWhenWritingAndOnlyOnChange) {
     EXPECT_FALSE(std::filesystem::exists(folder.File("config")));
 
     ASSERT_EQ(Put(registry, kHkeyCurrentUser, "A", "v", kRegDword, "\1\0\0\0"s), 0);
-    EXPECT_EQ(ModeOf(folder.File("config")), 0700u);
-    EXPECT_EQ(ModeOf(settings), 0700u);
     const std::string file = settings + "/" + FileRegistry::kCurrentUserFile;
     EXPECT_EQ(ModeOf(file), 0600u);
     EXPECT_EQ(Entries(settings), 1);

@@ -92,16 +92,6 @@ TEST(RegistryFile, ReadsHandEditedFiles) {
     EXPECT_EQ(app->Values()[1].second, (RegistryValue{4, "\x03\0\0\0"s}));
 }
 
-TEST(RegistryFile, SortsSubKeysAsWindowsDoes) {
-    RegistryKey root;
-    for (const char* name : {"b", "A_B", "a", "AB", "C"}) {
-        root.Make({name});
-    }
-    std::string order;
-    root.ForEachSubKey([&](const RegistryKey& cKey) { order += cKey.Name() + " "; });
-    EXPECT_EQ(order, "a AB A_B b C ");
-}
-
 TEST(RegistryFile, BadLinesCostOnlyThemselvesButAFileOfAnotherKindIsDamagedAsAWhole) {
     const std::string junk = "\x01\x02\xff\xfe binary\0junk\0"s;
     const std::string text =
