@@ -45,6 +45,8 @@ void Channel::GoOffline() {
             break;
         case ComTypeCode::Opc:
             mvRawValue = Variant::Null();
+            mcOpcItem = nullptr;
+            mcOpcClient = nullptr;
             break;
         default:
             mPlatform.dialogs.MsgBox("Error: Channel.GoOffline", MsgBoxStyle::OKOnly, "");
