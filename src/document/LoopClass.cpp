@@ -2,9 +2,9 @@
 
 #include <algorithm>
 #include <array>
-#include <cctype>
 
 #include "document/TunerType.h"
+#include "platform/AsciiCase.h"
 
 namespace cv {
 
@@ -85,10 +85,7 @@ std::string LoopClass::MinOrSecPerRep() const {
 }
 
 std::string LoopClass::DUnitsString() const {
-    std::string sLower = msdUnits;
-    std::transform(sLower.begin(), sLower.end(), sLower.begin(),
-                   [](unsigned char c) { return static_cast<char>(std::tolower(c)); });
-    return sLower.find("min") != std::string::npos ? "minutes" : "seconds";
+    return AsciiLower(msdUnits).find("min") != std::string::npos ? "minutes" : "seconds";
 }
 
 std::string LoopClass::FilterUnits() const {

@@ -1,8 +1,9 @@
 #include "document/ModeMapClass.h"
 
 #include <algorithm>
-#include <cctype>
 #include <utility>
+
+#include "platform/AsciiCase.h"
 
 namespace cv {
 
@@ -21,14 +22,6 @@ std::string TrimSpaces(const std::string& sText) {
 
 bool IsTerminator(char c) {
     return c == '\n' || c == '\r' || c == '\t';
-}
-
-std::string Upper(const std::string& sText) {
-    std::string result = sText;
-    for (char& c : result) {
-        c = static_cast<char>(std::toupper(static_cast<unsigned char>(c)));
-    }
-    return result;
 }
 
 }  // namespace
@@ -56,9 +49,9 @@ void ModeMapClass::AddModeMapItem2(const std::string& sKey, const std::string& s
 }
 
 std::string ModeMapClass::GetModeMapKey(const std::string& sValue) const {
-    const std::string sWanted = Upper(sValue);
+    const std::string sWanted = AsciiUpper(sValue);
     for (const Entry& entry : maEntries) {
-        if (Upper(entry.sValue) == sWanted) {
+        if (AsciiUpper(entry.sValue) == sWanted) {
             return entry.sKey;
         }
     }
@@ -92,9 +85,9 @@ std::string ModeMapClass::GetModeMapValueByPos(int16_t iPosition) const {
 // Compares the text with as many leading characters of each key as the text
 // has; a key shorter than the text is compared whole and so never matches.
 std::string ModeMapClass::GetModeMapValueFromLeftKeySubString(const std::string& sText) const {
-    const std::string sWanted = Upper(sText);
+    const std::string sWanted = AsciiUpper(sText);
     for (const Entry& entry : maEntries) {
-        if (Upper(entry.sKey.substr(0, sWanted.size())) == sWanted) {
+        if (AsciiUpper(entry.sKey.substr(0, sWanted.size())) == sWanted) {
             return entry.sValue;
         }
     }

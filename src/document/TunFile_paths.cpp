@@ -5,6 +5,7 @@
 
 #include "app/Utility.h"
 #include "document/TunFile.h"
+#include "platform/AsciiCase.h"
 #include "stores/InvariantNumber.h"
 
 namespace cv {
@@ -47,12 +48,6 @@ bool FolderIsWritable(std::string sFolder) {
     return false;
 }
 
-bool SameText(const std::string& sA, const std::string& sB) {
-    const auto Lower = [](unsigned char c) { return c >= 'A' && c <= 'Z' ? c + 32 : c; };
-    return std::equal(sA.begin(), sA.end(), sB.begin(), sB.end(),
-                      [&](char a, char b) { return Lower(a) == Lower(b); });
-}
-
 }  // namespace
 
 std::string TunFile::DefaultPath() const {
@@ -82,9 +77,9 @@ void TunFile::ConvertFileFormat() {
     }
     for (const char* sKey : kWordBooleanKeys) {
         const std::string sValue = mcIniFile.ReadString("DDE", sKey, "");
-        if (SameText(sValue, "True")) {
+        if (EqualsIgnoringCase(sValue, "True")) {
             mcIniFile.WriteString("DDE", sKey, "1");
-        } else if (SameText(sValue, "False")) {
+        } else if (EqualsIgnoringCase(sValue, "False")) {
             mcIniFile.WriteString("DDE", sKey, "0");
         }
     }

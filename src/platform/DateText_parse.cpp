@@ -3,6 +3,7 @@
 #include <optional>
 #include <vector>
 
+#include "platform/AsciiCase.h"
 #include "platform/ConversionError.h"
 #include "platform/DateText.h"
 #include "platform/Locale.h"
@@ -21,13 +22,6 @@ struct Token {
 
 bool IsSeparator(char c) {
     return c == ' ' || c == '\t' || c == ',' || c == '/' || c == '-' || c == '.';
-}
-
-bool EqualsNoCase(std::string_view a, std::string_view b) {
-    return a.size() == b.size() && std::equal(a.begin(), a.end(), b.begin(), [](char x, char y) {
-               return std::toupper(static_cast<unsigned char>(x)) ==
-                      std::toupper(static_cast<unsigned char>(y));
-           });
 }
 
 std::optional<std::vector<Token>> Tokenize(std::string_view text) {
@@ -87,13 +81,14 @@ bool ReadWord(const std::string& word, DateFields& fields) {
         fields.month = month;
         return first;
     }
-    if (EqualsNoCase(word, "AM") || EqualsNoCase(word, "A")) {
+    if (EqualsIgnoringCase(word, "AM") || EqualsIgnoringCase(word, "A")) {
         fields.halfDay = 1;
-    } else if (EqualsNoCase(word, "PM") || EqualsNoCase(word, "P")) {
+    } else if (EqualsIgnoringCase(word, "PM") || EqualsIgnoringCase(word, "P")) {
         fields.halfDay = 2;
     } else {
         for (int32_t day = 0; day < 7; ++day) {
-            if (EqualsNoCase(word, DayName(day, false)) || EqualsNoCase(word, DayName(day, true))) {
+            if (EqualsIgnoringCase(word, DayName(day, false)) ||
+                EqualsIgnoringCase(word, DayName(day, true))) {
                 return true;
             }
         }
@@ -195,8 +190,8 @@ bool ResolveTime(const DateFields& fields, OleDateParts& parts) {
 
 int32_t MonthFromName(std::string_view name) {
     for (int32_t month = 1; month <= 12; ++month) {
-        if (EqualsNoCase(name, MonthName(month, false)) ||
-            EqualsNoCase(name, MonthName(month, true))) {
+        if (EqualsIgnoringCase(name, MonthName(month, false)) ||
+            EqualsIgnoringCase(name, MonthName(month, true))) {
             return month;
         }
     }

@@ -1,9 +1,9 @@
 #include "platform/ValueText.h"
 
 #include <algorithm>
-#include <cctype>
 #include <cmath>
 
+#include "platform/AsciiCase.h"
 #include "platform/ConversionError.h"
 #include "platform/DateText.h"
 #include "platform/DecimalText.h"
@@ -24,17 +24,9 @@ std::string RealText(double value, int32_t precision, const platform::Locale& lo
     return WriteDecimal(RoundToSignificant(value, precision), precision, locale.DecimalSeparator());
 }
 
-bool EqualsNoCase(const std::string& text, std::string_view word) {
-    return text.size() == word.size() &&
-           std::equal(text.begin(), text.end(), word.begin(), [](char a, char b) {
-               return std::toupper(static_cast<unsigned char>(a)) ==
-                      std::toupper(static_cast<unsigned char>(b));
-           });
-}
-
 ErrorInfo TextToBool(const std::string& text, const platform::Locale& locale, Variant& value) {
-    if (EqualsNoCase(text, "True") || EqualsNoCase(text, "False")) {
-        value = Variant::Bool(EqualsNoCase(text, "True"));
+    if (EqualsIgnoringCase(text, "True") || EqualsIgnoringCase(text, "False")) {
+        value = Variant::Bool(EqualsIgnoringCase(text, "True"));
         return {};
     }
     double number = 0;

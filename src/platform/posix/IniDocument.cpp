@@ -3,6 +3,8 @@
 #include <algorithm>
 #include <initializer_list>
 
+#include "platform/AsciiCase.h"
+
 namespace cv::posix {
 
 namespace {
@@ -16,13 +18,6 @@ std::string_view Trim(std::string_view sText) {
         return {};
     }
     return sText.substr(first, sText.find_last_not_of(kBlanks) - first + 1);
-}
-
-std::string Lower(std::string_view sText) {
-    std::string lower(sText);
-    std::transform(lower.begin(), lower.end(), lower.begin(),
-                   [](char c) { return (c >= 'A' && c <= 'Z') ? static_cast<char>(c + 32) : c; });
-    return lower;
 }
 
 char FirstNonBlank(std::string_view sText) {
@@ -124,7 +119,7 @@ void IniDocument::IndexKeys(uint32_t lBlock) {
     entries.keys.clear();
     for (uint32_t line = 0; line < entries.lines.size(); ++line) {
         if (const auto key = EntryKey(entries.lines[line].text)) {
-            entries.keys.try_emplace(Lower(*key), line);
+            entries.keys.try_emplace(AsciiLower(*key), line);
         }
     }
 }
@@ -132,7 +127,7 @@ void IniDocument::IndexKeys(uint32_t lBlock) {
 void IniDocument::IndexSections() {
     mcSections.clear();
     for (uint32_t block = 1; block < mcBlocks.size(); ++block) {
-        mcSections[Lower(*HeaderName(mcBlocks[block].lines.front().text))].push_back(block);
+        mcSections[AsciiLower(*HeaderName(mcBlocks[block].lines.front().text))].push_back(block);
     }
 }
 
@@ -152,7 +147,7 @@ std::string IniDocument::Serialise() const {
 }
 
 const std::vector<uint32_t>* IniDocument::BlocksOf(std::string_view sSection) const {
-    const auto found = mcSections.find(Lower(Trim(sSection)));
+    const auto found = mcSections.find(AsciiLower(Trim(sSection)));
     return found == mcSections.end() ? nullptr : &found->second;
 }
 
@@ -162,7 +157,7 @@ std::optional<std::string> IniDocument::Value(std::string_view sSection,
     if (blocks == nullptr) {
         return std::nullopt;
     }
-    const std::string lowerKey = Lower(Trim(sKey));
+    const std::string lowerKey = AsciiLower(Trim(sKey));
     for (const uint32_t block : *blocks) {
         const auto found = mcBlocks[block].keys.find(lowerKey);
         if (found != mcBlocks[block].keys.end()) {
@@ -180,7 +175,7 @@ bool IniDocument::SetValue(std::string_view sSection, std::string_view sKey,
         AppendSection(Trim(sSection), Trim(sKey), sValue);
         return true;
     }
-    const std::string lowerKey = Lower(Trim(sKey));
+    const std::string lowerKey = AsciiLower(Trim(sKey));
     for (const uint32_t block : *blocks) {
         const auto found = mcBlocks[block].keys.find(lowerKey);
         if (found != mcBlocks[block].keys.end()) {
@@ -234,9 +229,9 @@ void IniDocument::AppendSection(std::string_view sSection, std::string_view sKey
     Block block{true, {}, {}};
     block.lines.push_back(NewLine(Joined({"[", sSection, "]"})));
     block.lines.push_back(NewLine(Joined({sKey, "=", sValue})));
-    block.keys.emplace(Lower(sKey), 1);
+    block.keys.emplace(AsciiLower(sKey), 1);
     mcBlocks.push_back(std::move(block));
-    mcSections[Lower(sSection)].push_back(static_cast<uint32_t>(mcBlocks.size() - 1));
+    mcSections[AsciiLower(sSection)].push_back(static_cast<uint32_t>(mcBlocks.size() - 1));
 }
 
 bool IniDocument::EraseKey(std::string_view sSection, std::string_view sKey) {
@@ -244,7 +239,7 @@ bool IniDocument::EraseKey(std::string_view sSection, std::string_view sKey) {
     if (blocks == nullptr) {
         return false;
     }
-    const std::string lowerKey = Lower(Trim(sKey));
+    const std::string lowerKey = AsciiLower(Trim(sKey));
     bool changed = false;
     for (const uint32_t block : *blocks) {
         if (!mcBlocks[block].keys.contains(lowerKey)) {
@@ -252,7 +247,7 @@ bool IniDocument::EraseKey(std::string_view sSection, std::string_view sKey) {
         }
         std::erase_if(mcBlocks[block].lines, [&lowerKey](const Line& line) {
             const auto lineKey = EntryKey(line.text);
-            return lineKey && Lower(*lineKey) == lowerKey;
+            return lineKey && AsciiLower(*lineKey) == lowerKey;
         });
         IndexKeys(block);
         changed = true;

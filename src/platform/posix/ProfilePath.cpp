@@ -3,19 +3,13 @@
 #include <sys/stat.h>
 
 #include <algorithm>
-#include <cctype>
 #include <filesystem>
+
+#include "platform/AsciiCase.h"
 
 namespace cv::posix {
 
 namespace {
-
-bool SameIgnoringCase(const std::string& sLeft, const std::string& sRight) {
-    return std::equal(sLeft.begin(), sLeft.end(), sRight.begin(), sRight.end(),
-                      [](unsigned char left, unsigned char right) {
-                          return std::tolower(left) == std::tolower(right);
-                      });
-}
 
 std::string NameInFolder(const std::string& sName, const std::string& sFolder) {
     const std::string exact = sFolder + "/" + sName;
@@ -28,7 +22,7 @@ std::string NameInFolder(const std::string& sName, const std::string& sFolder) {
     for (std::filesystem::directory_iterator entry(sFolder, error);
          !error && entry != std::filesystem::directory_iterator(); entry.increment(error)) {
         const std::string name = entry->path().filename().string();
-        if (SameIgnoringCase(name, sName) && (found.empty() || name < found)) {
+        if (EqualsIgnoringCase(name, sName) && (found.empty() || name < found)) {
             found = name;
         }
     }

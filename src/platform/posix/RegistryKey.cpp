@@ -2,16 +2,12 @@
 
 #include <iterator>
 
+#include "platform/AsciiCase.h"
+
 namespace cv::posix {
 
 std::string RegistryKey::Folded(std::string_view sName) {
-    std::string folded(sName);
-    for (char& c : folded) {
-        if (c >= 'a' && c <= 'z') {
-            c = static_cast<char>(c - 'a' + 'A');
-        }
-    }
-    return folded;
+    return AsciiUpper(sName);
 }
 
 bool RegistryKey::SplitPath(std::string_view sPath, std::vector<std::string>& vNames) {
