@@ -5,9 +5,7 @@
 // as one batch for the whole document.
 
 #include <benchmark/benchmark.h>
-#include <unistd.h>
 
-#include <filesystem>
 #include <fstream>
 #include <sstream>
 #include <string>
@@ -16,6 +14,7 @@
 #include "platform/posix/FileProfiles.h"
 #include "platform/posix/IniDocument.h"
 #include "stores/IniFile.h"
+#include "support/TempFolder.h"
 
 namespace {
 
@@ -32,9 +31,6 @@ struct Entry {
 class Workspace {
   public:
     Workspace() {
-        std::string pattern =
-            (std::filesystem::temp_directory_path() / "ini-bench-XXXXXX").string();
-        folder_ = ::mkdtemp(pattern.data());
         for (int section = 0; section < kSections; ++section) {
             for (int key = 0; key < kKeysPerSection; ++key) {
                 entries_.push_back(
@@ -43,7 +39,6 @@ class Workspace {
         }
         Reset();
     }
-    ~Workspace() { std::filesystem::remove_all(folder_); }
 
     // Writes the file afresh: every value is "0.125".
     void Reset() const {
@@ -57,12 +52,12 @@ class Workspace {
         }
     }
 
-    std::string Path() const { return folder_ + "/Large.tun"; }
-    std::string Config() const { return folder_ + "/config"; }
+    std::string Path() const { return folder_.File("Large.tun"); }
+    std::string Config() const { return folder_.File("config"); }
     const std::vector<Entry>& Entries() const { return entries_; }
 
   private:
-    std::string folder_;
+    cv::test::TempFolder folder_;
     std::vector<Entry> entries_;
 };
 

@@ -9,9 +9,10 @@
 #include <unistd.h>
 
 #include <cstdlib>
-#include <filesystem>
 #include <string>
 #include <vector>
+
+#include "support/TempFolder.h"
 
 extern char** environ;
 
@@ -62,19 +63,14 @@ bool RunOnce(const char* program, std::vector<std::string>& environment) {
 
 void BM_StartUntilWindowShown(benchmark::State& state) {
 #ifdef CV_PROGRAM_PATH
-    std::string folder = (std::filesystem::temp_directory_path() / "cvstartupXXXXXX").string();
-    if (mkdtemp(folder.data()) == nullptr) {
-        state.SkipWithError("cannot create a settings folder");
-        return;
-    }
-    auto environment = ProgramEnvironment(folder);
+    const cv::test::TempFolder folder;
+    auto environment = ProgramEnvironment(folder.Path());
     for (auto _ : state) {
         if (!RunOnce(CV_PROGRAM_PATH, environment)) {
             state.SkipWithError("the program did not start and end cleanly");
             break;
         }
     }
-    std::filesystem::remove_all(folder);
 #else
     state.SkipWithError("built without the program (CV_BUILD_UI is off)");
 #endif
