@@ -22,9 +22,14 @@ class EventLoop {
     // Stopping an unknown or already stopped timer does nothing.
     virtual void StopTimer(TimerId id) = 0;
     // Queues a callback to run on the window thread between other events.
+    // Safe to call from any thread.
     virtual void Post(std::function<void()> event) = 0;
     // Runs the events that are pending now, then returns.
     virtual void DoEvents() = 0;
+    // Lets events run (timers, posted events, input) until done() answers
+    // true or timeoutMs has passed; answers done(). done() is asked after
+    // every event. Calls may nest.
+    virtual bool WaitUntil(const std::function<bool()>& done, uint32_t timeoutMs) = 0;
 };
 
 }  // namespace cv::platform

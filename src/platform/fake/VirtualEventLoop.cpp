@@ -19,6 +19,7 @@ void VirtualEventLoop::StopTimer(TimerId id) {
 }
 
 void VirtualEventLoop::Post(std::function<void()> event) {
+    const std::lock_guard lock(postedMutex_);
     posted_.push_back(std::move(event));
 }
 
@@ -27,11 +28,29 @@ void VirtualEventLoop::DoEvents() {
     RunPosted();
 }
 
+bool VirtualEventLoop::WaitUntil(const std::function<bool()>& done, uint32_t timeoutMs) {
+    const uint64_t deadline = now_ + timeoutMs;
+    RunPosted();
+    while (!done()) {
+        if (!FireNextDue(deadline)) {
+            now_ = std::max(now_, deadline);
+            return done();
+        }
+        RunPosted();
+    }
+    return true;
+}
+
 void VirtualEventLoop::RunPosted() {
     // Only what is pending now: events posted by these events wait their turn.
-    for (auto pending = posted_.size(); pending > 0 && !posted_.empty(); --pending) {
-        auto event = std::move(posted_.front());
-        posted_.pop_front();
+    std::deque<std::function<void()>> pending;
+    {
+        const std::lock_guard lock(postedMutex_);
+        pending.swap(posted_);
+    }
+    while (!pending.empty()) {
+        auto event = std::move(pending.front());
+        pending.pop_front();
         event();
     }
 }
@@ -42,7 +61,8 @@ void VirtualEventLoop::Advance(uint32_t ms) {
     while (FireNextDue(until)) {
         RunPosted();
     }
-    now_ = until;
+    // A wait inside a timer may have carried the clock past the end already.
+    now_ = std::max(now_, until);
 }
 
 bool VirtualEventLoop::FireNextDue(uint64_t until) {
@@ -56,7 +76,7 @@ bool VirtualEventLoop::FireNextDue(uint64_t until) {
     if (next == timers_.end()) {
         return false;
     }
-    now_ = next->second.due;
+    now_ = std::max(now_, next->second.due);
     auto onTimeout = next->second.onTimeout;
     if (next->second.repeating) {
         next->second.due += next->second.interval;

@@ -4,6 +4,7 @@
 #include <deque>
 #include <functional>
 #include <map>
+#include <mutex>
 
 #include "platform/EventLoop.h"
 
@@ -11,7 +12,9 @@ namespace cv::fake {
 
 // An event loop whose clock moves only when the test says so. Timers fire in
 // order of their due time while the clock is advanced; posted events run on
-// DoEvents and whenever the clock is advanced.
+// DoEvents and whenever the clock is advanced. WaitUntil moves the clock
+// from timer to timer until it is done, so a wait of many virtual seconds
+// takes no real time; it does not wait for events other threads may post.
 class VirtualEventLoop : public platform::EventLoop {
   public:
     explicit VirtualEventLoop(uint32_t startMs = 0) : now_(startMs) {}
@@ -22,6 +25,7 @@ class VirtualEventLoop : public platform::EventLoop {
     void StopTimer(TimerId id) override;
     void Post(std::function<void()> event) override;
     void DoEvents() override;
+    bool WaitUntil(const std::function<bool()>& done, uint32_t timeoutMs) override;
 
     // Moves the clock forward by ms, firing every timer that falls due.
     void Advance(uint32_t ms);
@@ -40,6 +44,7 @@ class VirtualEventLoop : public platform::EventLoop {
     void RunPosted();
 
     uint64_t now_;
+    std::mutex postedMutex_;
     TimerId nextId_ = 1;
     std::map<TimerId, Timer> timers_;
     std::deque<std::function<void()>> posted_;

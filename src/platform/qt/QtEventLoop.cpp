@@ -1,6 +1,7 @@
 #include "platform/qt/QtEventLoop.h"
 
 #include <QCoreApplication>
+#include <QElapsedTimer>
 #include <algorithm>
 #include <chrono>
 #include <climits>
@@ -58,6 +59,24 @@ void QtEventLoop::Post(std::function<void()> event) {
 
 void QtEventLoop::DoEvents() {
     QCoreApplication::processEvents();
+}
+
+bool QtEventLoop::WaitUntil(const std::function<bool()>& done, uint32_t timeoutMs) {
+    // Every completion arrives as an event, so done() can only change after
+    // one; the single-shot timer wakes the wait at its deadline.
+    QElapsedTimer elapsed;
+    elapsed.start();
+    QTimer deadline;
+    deadline.setSingleShot(true);
+    deadline.setTimerType(Qt::PreciseTimer);
+    deadline.start(static_cast<int>(std::min<uint32_t>(timeoutMs, INT_MAX)));
+    while (!done()) {
+        if (static_cast<uint64_t>(elapsed.elapsed()) >= timeoutMs) {
+            return false;
+        }
+        QCoreApplication::processEvents(QEventLoop::AllEvents | QEventLoop::WaitForMoreEvents);
+    }
+    return true;
 }
 
 }  // namespace cv::qtui

@@ -22,6 +22,7 @@ class QtEventLoop : public platform::EventLoop {
     void StopTimer(TimerId id) override;
     void Post(std::function<void()> event) override;
     void DoEvents() override;
+    bool WaitUntil(const std::function<bool()>& done, uint32_t timeoutMs) override;
 
     int ActiveTimers() const { return static_cast<int>(timers_.size()); }
 

@@ -3,6 +3,7 @@
 #include <gtest/gtest.h>
 
 #include <string>
+#include <vector>
 
 namespace cv::fake {
 namespace {
@@ -51,6 +52,35 @@ TEST(VirtualEventLoop, PostedEventsRunOnDoEventsButNotTheirOwnFollowers) {
     EXPECT_EQ(runs, 1);
     loop.DoEvents();
     EXPECT_EQ(runs, 2);
+}
+
+TEST(VirtualEventLoop, WaitUntilRunsTimersUntilDoneOrTheDeadline) {
+    VirtualEventLoop loop(100);
+    bool answered = false;
+    loop.StartTimer(7000, false, [&] { answered = true; });
+    EXPECT_TRUE(loop.WaitUntil([&] { return answered; }, 30000));
+    EXPECT_EQ(loop.TimeGetTime(), 7100u) << "the clock stops at the event that ended the wait";
+
+    int ticks = 0;
+    loop.StartTimer(100, true, [&] { ++ticks; });
+    EXPECT_FALSE(loop.WaitUntil([] { return false; }, 1000));
+    EXPECT_EQ(loop.TimeGetTime(), 8100u);
+    EXPECT_EQ(ticks, 10);
+
+    bool posted = false;
+    loop.Post([&] { posted = true; });
+    EXPECT_TRUE(loop.WaitUntil([&] { return posted; }, 0));
+}
+
+TEST(VirtualEventLoop, AWaitInsideATimerNeverTurnsTheClockBack) {
+    VirtualEventLoop loop;
+    std::vector<uint32_t> seen;
+    loop.StartTimer(10, false, [&] { loop.WaitUntil([] { return false; }, 500); });
+    loop.StartTimer(20, false, [&] { seen.push_back(loop.TimeGetTime()); });
+    loop.Advance(100);
+    EXPECT_EQ(loop.TimeGetTime(), 510u);
+    ASSERT_EQ(seen.size(), 1u);
+    EXPECT_EQ(seen[0], 20u) << "the other timer ran inside the wait, at its own time";
 }
 
 }  // namespace

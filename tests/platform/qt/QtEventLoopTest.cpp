@@ -71,6 +71,14 @@ class QtEventLoopTest : public QObject {
         QTest::qWait(5);
         QCOMPARE(repeats, 3);
     }
+
+    void waitUntilEndsOnAPostedAnswerOrAtItsDeadline() {
+        QtEventLoop loop;
+        bool answered = false;
+        loop.StartTimer(1, false, [&] { loop.Post([&] { answered = true; }); });
+        QVERIFY(loop.WaitUntil([&] { return answered; }, 60000));
+        QVERIFY(!loop.WaitUntil([] { return false; }, 5));
+    }
 };
 
 QTEST_GUILESS_MAIN(QtEventLoopTest)
