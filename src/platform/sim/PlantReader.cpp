@@ -86,7 +86,8 @@ void PlantReader::ExpectObject(const Node& node, std::initializer_list<const cha
     if (!node->is_object()) {
         Fail(node, "needs an object ({...})");
     }
-    for (const auto& [key, value] : node->items()) {
+    for (auto entry = node->begin(); entry != node->end(); ++entry) {
+        const std::string& key = entry.key();
         const bool known = std::any_of(allowed.begin(), allowed.end(),
                                        [&](const char* name) { return key == name; });
         if (!known) {
