@@ -1,8 +1,8 @@
 #include <cfloat>
 #include <cmath>
-#include <cstdio>
 #include <limits>
 #include <optional>
+#include <string_view>
 
 #include "platform/OleDate.h"
 #include "platform/sim/Generator.h"
@@ -31,20 +31,33 @@ const char* NameOfType(uint16_t type) {
     return "?";
 }
 
+// The number written with count digits at position at of the text.
+bool Digits(std::string_view text, size_t at, size_t count, int32_t& value) {
+    if (at + count > text.size()) {
+        return false;
+    }
+    value = 0;
+    for (size_t i = at; i < at + count; ++i) {
+        if (text[i] < '0' || text[i] > '9') {
+            return false;
+        }
+        value = value * 10 + (text[i] - '0');
+    }
+    return true;
+}
+
 // "2024-05-01" or "2024-05-01 13:45:00" (a T may stand for the blank).
-std::optional<double> DateFromText(const std::string& text) {
+std::optional<double> DateFromText(std::string_view text) {
     OleDateParts parts;
-    int used = 0;
-    const char* c = text.c_str();
-    const bool dayOnly =
-        std::sscanf(c, "%d-%d-%d%n", &parts.year, &parts.month, &parts.day, &used) == 3 &&
-        static_cast<size_t>(used) == text.size();
-    const bool withTime =
-        !dayOnly &&
-        std::sscanf(c, "%d-%d-%d%*1[ T]%d:%d:%d%n", &parts.year, &parts.month, &parts.day,
-                    &parts.hour, &parts.minute, &parts.second, &used) == 6 &&
-        static_cast<size_t>(used) == text.size();
-    if (!dayOnly && !withTime) {
+    const bool day = (text.size() == 10 || text.size() == 19) && Digits(text, 0, 4, parts.year) &&
+                     text[4] == '-' && Digits(text, 5, 2, parts.month) && text[7] == '-' &&
+                     Digits(text, 8, 2, parts.day);
+    const bool time =
+        day && (text.size() == 10 ||
+                ((text[10] == ' ' || text[10] == 'T') && Digits(text, 11, 2, parts.hour) &&
+                 text[13] == ':' && Digits(text, 14, 2, parts.minute) && text[16] == ':' &&
+                 Digits(text, 17, 2, parts.second)));
+    if (!time) {
         return std::nullopt;
     }
     return OleDateFromParts(parts);

@@ -95,6 +95,9 @@ TEST(PlantLoader, AFaultNamesTheFileTheLineAndTheProblem) {
         {Plant(R"({ "name": "PV", "type": "I2", "value": 40000 })"),
          "mine.json, line 5: servers[0].namespace.items[0].value: needs a whole number that fits "
          "I2 (-32768 to 32767)"},
+        {Plant(R"({ "name": "D", "type": "DATE[]", "value": ["2024-02-29", "2023-02-29"] })"),
+         "mine.json, line 5: servers[0].namespace.items[0].value[1]: needs a date from "
+         "0100-01-01 to 9999-12-31, as \"YYYY-MM-DD\", \"YYYY-MM-DD hh:mm:ss\" or a day number"},
         {Plant(R"({ "name": "P V", "type": "R8" })"),
          "mine.json, line 5: servers[0].namespace.items[0].name: \"P V\" is not a usable name: "
          "it needs printable characters, without blanks or dots"},

@@ -108,6 +108,18 @@ TEST_F(SimFaultTest, ValuesAndQualitiesSetByATestReachTheClientUnchanged) {
     EXPECT_EQ(ReadOne(*client.group, client.handle).quality, 0x54);
 }
 
+TEST_F(SimFaultTest, ObjectsHandedOutMayOutliveThePlantObject) {
+    auto own = std::make_unique<SimulatedPlant>(BuiltInPlant(), wait);
+    std::unique_ptr<OPCServer> server;
+    ASSERT_FALSE(own->CreateServer(server));
+    ASSERT_FALSE(server->Connect("Sim.Plant.1", ""));
+    auto group = AddGroup(*server);
+    const int32_t handle = AddItem(*group, "Signals.Sine");
+    own.reset();
+    events.Advance(2000);
+    EXPECT_EQ(ReadOne(*group, handle).quality, 0xC0);
+}
+
 TEST_F(SimFaultTest, ChangesNamingNothingInThePlantAreRefused) {
     EXPECT_EQ(plant.DropServer("NOWHERE", "Sim.Plant.1").Number, E_INVALIDARG);
     EXPECT_EQ(plant.DropServer("FILESRV", "Sim.Plant.1").Number, E_INVALIDARG);
