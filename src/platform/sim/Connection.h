@@ -24,7 +24,6 @@ class Connection : public std::enable_shared_from_this<Connection> {
     Connection(const Connection&) = delete;
     Connection& operator=(const Connection&) = delete;
 
-    PlantRuntime& Runtime() { return *runtime_; }
     const std::shared_ptr<PlantRuntime>& SharedRuntime() const { return runtime_; }
 
     ErrorInfo Connect(const std::string& progId, const std::string& node);
@@ -33,7 +32,6 @@ class Connection : public std::enable_shared_from_this<Connection> {
     // The server object is gone: as Disconnect, and no more events.
     void Release();
 
-    bool Connected() const { return connected_; }
     const std::string& ClientName() const { return clientName_; }
     void SetClientName(std::string name) { clientName_ = std::move(name); }
     const std::string& ProgId() const { return progId_; }

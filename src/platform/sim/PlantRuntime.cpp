@@ -71,7 +71,7 @@ std::shared_ptr<ServerInstance> PlantRuntime::Instance(const ComputerSpec& compu
                                                        const ServerSpec& server) {
     auto& instance = instances_[{&computer, &server}];
     if (!instance) {
-        instance = std::make_shared<ServerInstance>(*this, computer, server);
+        instance = std::make_shared<ServerInstance>(*this, server);
     }
     return instance;
 }

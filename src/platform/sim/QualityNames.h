@@ -22,7 +22,6 @@ std::optional<uint16_t> QualityByName(std::string_view name);
 std::string QualityNameList();
 
 namespace Quality {
-inline constexpr uint16_t Good = 0xC0;
 inline constexpr uint16_t OutOfService = 0x1C;
 }  // namespace Quality
 

@@ -58,10 +58,8 @@ int32_t ConvertForWrite(const Variant& value, uint16_t type, Variant& converted)
 
 }  // namespace
 
-ServerInstance::ServerInstance(PlantRuntime& runtime, const ComputerSpec& computer,
-                               const ServerSpec& server)
+ServerInstance::ServerInstance(PlantRuntime& runtime, const ServerSpec& server)
     : runtime_(runtime),
-      computer_(computer),
       server_(server),
       callDelayMs_(server.callDelayMs),
       items_(server.items.size()),

@@ -32,17 +32,15 @@ struct ItemRuntime {
 // across restarts; so do the settings that tests change.
 class ServerInstance {
   public:
-    ServerInstance(PlantRuntime& runtime, const ComputerSpec& computer, const ServerSpec& server);
+    ServerInstance(PlantRuntime& runtime, const ServerSpec& server);
     ~ServerInstance();
     ServerInstance(const ServerInstance&) = delete;
     ServerInstance& operator=(const ServerInstance&) = delete;
 
     const ServerSpec& Spec() const { return server_; }
-    const ComputerSpec& Computer() const { return computer_; }
     uint32_t CallDelay() const { return callDelayMs_; }
     void SetCallDelay(uint32_t ms) { callDelayMs_ = ms; }
 
-    bool Running() const { return running_; }
     // Starts the server when it is not running; a server that shuts down
     // after a while counts that while from here.
     void Start(const std::shared_ptr<ServerInstance>& self);
@@ -72,7 +70,6 @@ class ServerInstance {
     void Update(ItemRuntime& runtime, Variant value, uint16_t quality);
 
     PlantRuntime& runtime_;
-    const ComputerSpec& computer_;
     const ServerSpec& server_;
     uint32_t callDelayMs_;
     bool running_ = false;

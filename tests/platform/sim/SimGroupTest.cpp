@@ -183,6 +183,7 @@ TEST_F(SimGroupTest, ADeviceReadGivesTheValueNowACacheReadTheLastOneSeen) {
     EXPECT_NEAR(cache.value.AsR8(), 2500 * 100.0 / 60000, 1e-9) << "the device read refreshed it";
     EXPECT_EQ(device.quality, 0xC0);
     EXPECT_DOUBLE_EQ(device.stamp, kStartDate + 2500 / 86400000.0);
+    EXPECT_DOUBLE_EQ(plant.Now(), device.stamp);
 
     events.Advance(500);
     EXPECT_NEAR(ReadOne(*group, handle, 1).value.AsR8(), 3000 * 100.0 / 60000, 1e-9);

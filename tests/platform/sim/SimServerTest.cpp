@@ -31,6 +31,7 @@ TEST_F(SimServerTest, ConnectAnswersAsTheComputerAndServerAre) {
         EXPECT_EQ(error.Number, c.result) << c.id << " on " << c.node;
         EXPECT_EQ(error.Description.empty(), c.result == S_OK) << c.id;
     }
+    EXPECT_EQ(plant.LocalComputerName(), "MYPC");
 }
 
 TEST_F(SimServerTest, NameAndNodeAreWhatConnectWasGivenWhileConnected) {
