@@ -1,6 +1,7 @@
 #pragma once
 
 #include <cstdint>
+#include <initializer_list>
 #include <utility>
 #include <vector>
 
@@ -13,7 +14,11 @@ class OneBased {
   public:
     OneBased() = default;
     explicit OneBased(std::vector<T> values) : values_(std::move(values)) {}
-    explicit OneBased(int32_t count) : values_(count > 0 ? static_cast<size_t>(count) : 0) {}
+    OneBased(std::initializer_list<T> values) : values_(values) {}
+    // count default values; a negative count gives none.
+    static OneBased Sized(int32_t count) {
+        return OneBased(std::vector<T>(count > 0 ? static_cast<size_t>(count) : 0));
+    }
 
     int32_t Count() const { return static_cast<int32_t>(values_.size()); }
     const T& operator()(int32_t i) const { return values_.at(static_cast<size_t>(i) - 1); }

@@ -47,8 +47,8 @@ ErrorInfo GroupState::AddItems(int32_t count, const OneBased<std::string>& itemI
         (accessPaths.Count() != 0 && accessPaths.Count() < count)) {
         return ServerError(E_INVALIDARG);
     }
-    serverHandles = OneBased<int32_t>(count);
-    errors = OneBased<int32_t>(count);
+    serverHandles = OneBased<int32_t>::Sized(count);
+    errors = OneBased<int32_t>::Sized(count);
     for (int32_t i = 1; i <= count; ++i) {
         const std::string& path = accessPaths.Count() == 0 ? std::string() : accessPaths(i);
         errors(i) = AddOne(itemIds(i), clientHandles(i), path, serverHandles(i));
@@ -89,7 +89,7 @@ ErrorInfo GroupState::RemoveItems(int32_t count, const OneBased<int32_t>& server
     if (!CountFits(count, {serverHandles.Count()})) {
         return ServerError(E_INVALIDARG);
     }
-    errors = OneBased<int32_t>(count);
+    errors = OneBased<int32_t>::Sized(count);
     for (int32_t i = 1; i <= count; ++i) {
         const auto found = byHandle_.find(serverHandles(i));
         if (found == byHandle_.end()) {
@@ -146,10 +146,10 @@ ErrorInfo GroupState::SyncRead(int16_t source, int32_t count, const OneBased<int
         return ServerError(E_INVALIDARG);
     }
     ServerInstance& server = connection_.lock()->Server();
-    values = OneBased<Variant>(count);
-    errors = OneBased<int32_t>(count);
-    qualities = OneBased<int32_t>(count);
-    timeStamps = OneBased<double>(count);
+    values = OneBased<Variant>::Sized(count);
+    errors = OneBased<int32_t>::Sized(count);
+    qualities = OneBased<int32_t>::Sized(count);
+    timeStamps = OneBased<double>::Sized(count);
     for (int32_t i = 1; i <= count; ++i) {
         const GroupItemState* item = Lookup(handles(i));
         if (item == nullptr) {
@@ -175,7 +175,7 @@ ErrorInfo GroupState::SyncWrite(int32_t count, const OneBased<int32_t>& handles,
         return ServerError(E_INVALIDARG);
     }
     ServerInstance& server = connection_.lock()->Server();
-    errors = OneBased<int32_t>(count);
+    errors = OneBased<int32_t>::Sized(count);
     for (int32_t i = 1; i <= count; ++i) {
         const GroupItemState* item = Lookup(handles(i));
         errors(i) = item == nullptr ? OPC_E_INVALIDHANDLE : server.Write(item->item, values(i));

@@ -22,11 +22,6 @@ using platform::OneBased;
 using platform::OPCGroup;
 using platform::OPCServer;
 
-// A 1-based array of integers (OneBased<int32_t>({n}) would be n zeros).
-inline OneBased<int32_t> Ints(std::initializer_list<int32_t> values) {
-    return OneBased<int32_t>(std::vector<int32_t>(values));
-}
-
 // 2025-01-01 00:00 local time: the plant's clock starts here in tests.
 inline constexpr double kStartDate = 45658.0;
 
@@ -61,9 +56,9 @@ struct SimFixture : ::testing::Test {
                            const std::string& path = "") {
         OneBased<int32_t> handles;
         OneBased<int32_t> errors;
-        const ErrorInfo call =
-            group.OPCItems().AddItems(1, OneBased<std::string>({itemId}), Ints({clientHandle}),
-                                      OneBased<std::string>({path}), handles, errors);
+        const ErrorInfo call = group.OPCItems().AddItems(
+            1, OneBased<std::string>({itemId}), OneBased<int32_t>{clientHandle},
+            OneBased<std::string>({path}), handles, errors);
         EXPECT_FALSE(call);
         return errors(1) != 0 ? errors(1) : handles(1);
     }
@@ -82,7 +77,8 @@ struct SimFixture : ::testing::Test {
         OneBased<int32_t> qualities;
         OneBased<double> stamps;
         Read read;
-        read.call = group.SyncRead(source, 1, Ints({handle}), values, errors, qualities, stamps);
+        read.call =
+            group.SyncRead(source, 1, OneBased<int32_t>{handle}, values, errors, qualities, stamps);
         if (!read.call) {
             read = {{}, values(1), errors(1), qualities(1), stamps(1)};
         }
@@ -92,7 +88,7 @@ struct SimFixture : ::testing::Test {
     static int32_t WriteOne(OPCGroup& group, int32_t handle, const Variant& value) {
         OneBased<int32_t> errors;
         const ErrorInfo call =
-            group.SyncWrite(1, Ints({handle}), OneBased<Variant>({value}), errors);
+            group.SyncWrite(1, OneBased<int32_t>{handle}, OneBased<Variant>({value}), errors);
         return call ? call.Number : errors(1);
     }
 };

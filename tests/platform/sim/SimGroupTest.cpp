@@ -54,7 +54,7 @@ TEST_F(SimGroupTest, UnknownServerHandlesAreInvalidInEveryCall) {
     const int32_t handle = AddItem(*group, "Signals.Ramp");
     const int32_t unknown = handle + 100;
     OneBased<int32_t> errors;
-    ASSERT_FALSE(group->OPCItems().Remove(1, Ints({unknown}), errors));
+    ASSERT_FALSE(group->OPCItems().Remove(1, OneBased<int32_t>{unknown}, errors));
     EXPECT_EQ(errors(1), OPC_E_INVALIDHANDLE);
     EXPECT_EQ(ReadOne(*group, unknown).error, OPC_E_INVALIDHANDLE);
     EXPECT_EQ(WriteOne(*group, unknown, Variant::R8(1)), OPC_E_INVALIDHANDLE);
@@ -62,7 +62,7 @@ TEST_F(SimGroupTest, UnknownServerHandlesAreInvalidInEveryCall) {
     EXPECT_EQ(group->OPCItems().GetOPCItem(unknown, item).Number, OPC_E_INVALIDHANDLE);
 
     ASSERT_FALSE(group->OPCItems().GetOPCItem(handle, item));
-    ASSERT_FALSE(group->OPCItems().Remove(1, Ints({handle}), errors));
+    ASSERT_FALSE(group->OPCItems().Remove(1, OneBased<int32_t>{handle}, errors));
     EXPECT_EQ(ReadOne(*group, handle).error, OPC_E_INVALIDHANDLE) << "a removed item";
     EXPECT_EQ(item->SetIsActive(true).Number, OPC_E_INVALIDHANDLE);
 }
