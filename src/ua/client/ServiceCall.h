@@ -1,0 +1,39 @@
+#pragma once
+
+#include <functional>
+#include <memory>
+
+#include "ua/secure/SecureChannel.h"
+#include "ua/services/ServiceMessages.h"
+
+namespace cv::ua {
+
+// Sends one typed request over a secure channel and hands back the typed
+// response, or the error (time-out, fault, bad service result, broken
+// connection, malformed answer).
+template <class Request, class Response>
+void CallService(SecureChannel& channel, Request request, uint32_t timeoutMs,
+                 std::function<void(Result<Response>)> done) {
+    request.header.timestamp = DateTime::Now();
+    request.header.timeoutHint = timeoutMs;
+    const std::string_view service = ServiceName(Request::kEncodingId);
+    const uint32_t handle = request.header.requestHandle;
+    const DecodeLimits limits = channel.Limits();
+    channel.Send(EncodeMessage(request), service, timeoutMs,
+                 [done = std::move(done), service, handle, limits](Result<std::string> body) {
+                     if (!body) {
+                         done(body.Failure());
+                         return;
+                     }
+                     auto response = DecodeResponse<Response>(body.Value(), service, limits);
+                     if (response && response.Value().header.requestHandle != handle) {
+                         done(Error{status::BadUnknownResponse,
+                                    "The server answered the " + std::string(service) +
+                                        " request with another request's handle."});
+                         return;
+                     }
+                     done(std::move(response));
+                 });
+}
+
+}  // namespace cv::ua
