@@ -22,16 +22,22 @@ enum NodeIdEncoding : uint8_t {
 
 }  // namespace
 
+// An empty field goes as a null string: servers read an empty index range
+// or locale differently from none. An empty text value keeps its length 0.
 void Encoder::operator()(const std::string& v) {
+    if (v.empty()) {
+        Raw(int32_t{-1});
+        return;
+    }
+    TextValue(v);
+}
+
+void Encoder::TextValue(const std::string& v) {
     Raw(static_cast<int32_t>(v.size()));
     Bytes(v.data(), v.size());
 }
 
 void Encoder::operator()(const ByteString& v) {
-    if (v.bytes.empty()) {
-        Raw(int32_t{-1});
-        return;
-    }
     (*this)(v.bytes);
 }
 
@@ -150,6 +156,8 @@ void Encoder::VariantValue(const Variant::Storage& storage) {
             if constexpr (std::is_same_v<T, std::shared_ptr<const DataValue>> ||
                           std::is_same_v<T, std::shared_ptr<const DiagnosticInfo>>) {
                 (*this)(value ? *value : typename T::element_type{});
+            } else if constexpr (std::is_same_v<T, std::string>) {
+                TextValue(value);
             } else if constexpr (!std::is_same_v<T, std::monostate> &&
                                  !std::is_same_v<T, Variant::Elements>) {
                 (*this)(value);

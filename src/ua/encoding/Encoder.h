@@ -86,6 +86,7 @@ class Encoder {
         Bytes(&v, sizeof v);
     }
     void VariantValue(const Variant::Storage& storage);
+    void TextValue(const std::string& v);
 
     std::string& out_;
 };
