@@ -47,6 +47,9 @@ class SecureChannel : public std::enable_shared_from_this<SecureChannel> {
     void Close();
     // Closes the socket at once and drops every handler unheard.
     void Abort();
+    // Ends the connection for a fault found above the channel (an answer that
+    // cannot be decoded): pending requests and the lost handler hear reason.
+    void Break(const Error& reason) { Fail(reason); }
 
     void SetLostHandler(LostHandler lost) { lost_ = std::move(lost); }
     bool IsOpen() const { return state_ == State::Open; }
