@@ -1,5 +1,6 @@
 #include "ua/ScriptedServer.h"
 
+#include <algorithm>
 #include <asio/post.hpp>
 #include <asio/write.hpp>
 
@@ -204,14 +205,16 @@ void ScriptedServer::Record(const Request& request) {
     changed_.notify_all();
 }
 
-bool ScriptedServer::WaitForRequests(uint32_t typeId, size_t count) {
+bool ScriptedServer::WaitUntil(const std::function<bool(const std::vector<Request>&)>& holds) {
     std::unique_lock lock(mutex_);
-    return changed_.wait_for(lock, std::chrono::seconds(30), [&] {
-        size_t seen = 0;
-        for (const Request& request : received_) {
-            seen += request.typeId == typeId ? 1 : 0;
-        }
-        return seen >= count;
+    return changed_.wait_for(lock, std::chrono::seconds(30), [&] { return holds(received_); });
+}
+
+bool ScriptedServer::WaitForRequests(uint32_t typeId, size_t count) {
+    return WaitUntil([&](const std::vector<Request>& received) {
+        return static_cast<size_t>(
+                   std::count_if(received.begin(), received.end(),
+                                 [&](const Request& r) { return r.typeId == typeId; })) >= count;
     });
 }
 

@@ -66,6 +66,8 @@ class ScriptedServer {
     // For the test: waits (with a generous bound) until the server has
     // received a request of this encoding id count times.
     bool WaitForRequests(uint32_t typeId, size_t count);
+    // Waits (with the same bound) until holds() is true of the requests so far.
+    bool WaitUntil(const std::function<bool(const std::vector<Request>&)>& holds);
     std::vector<Request> Received(uint32_t typeId);
 
   private:

@@ -42,6 +42,18 @@ class DispatchQueue {
         return true;
     }
 
+    // Runs what is queued now, without waiting for more.
+    void RunPending() {
+        std::deque<std::function<void()>> now;
+        {
+            std::lock_guard lock(mutex_);
+            now.swap(queue_);
+        }
+        for (auto& work : now) {
+            work();
+        }
+    }
+
   private:
     std::mutex mutex_;
     std::condition_variable ready_;
