@@ -21,9 +21,10 @@ std::optional<T> Digits(std::string_view sText) {
     return value;
 }
 
-// "key=" or "key-" at the start of the text; the rest after it.
+// "key=" or "key-" at the start of the text; the rest after it, which may
+// not be empty.
 std::optional<std::string_view> After(std::string_view sText, std::string_view sKey) {
-    if (sText.size() <= sKey.size() || sText.substr(0, sKey.size()) != sKey ||
+    if (sText.size() <= sKey.size() + 1 || sText.substr(0, sKey.size()) != sKey ||
         (sText[sKey.size()] != '=' && sText[sKey.size()] != '-')) {
         return std::nullopt;
     }
