@@ -85,14 +85,24 @@ async function checkStaticValues({ session }) {
     });
 }
 
+// One write of each type the automation interface carries; arrays change length.
 const WRITES = [
     ["Memory.Boolean", DataType.Boolean, false],
     ["Memory.Int16", DataType.Int16, 321],
+    ["Memory.Int32", DataType.Int32, -7],
     ["Memory.Float", DataType.Float, -0.75],
-    ["Memory.String", DataType.String, "written"],
-    ["Memory.DoubleArray", DataType.Double, [4, 5, 6]],
+    ["Memory.Double", DataType.Double, 1e-300],
+    ["Memory.String", DataType.String, "written ✓"],
+    ["Memory.DateTime", DataType.DateTime, new Date("2025-06-30T23:59:59.125Z")],
+    ["Memory.Int32Array", DataType.Int32, [4, 5, 6, 7]],
+    ["Memory.DoubleArray", DataType.Double, [0.25]],
+    ["Memory.StringArray", DataType.String, ["x", "", "z"]],
     ["Plant.Area1.FIC101.SP", DataType.Double, 55.5]
 ];
+
+function plainWritten(value) {
+    return value instanceof Date ? value.toISOString() : value;
+}
 
 function writeValue(nodeId, dataType, value) {
     const arrayType = Array.isArray(value) ? VariantArrayType.Array : VariantArrayType.Scalar;
@@ -104,7 +114,8 @@ async function checkMemoryWrites({ session }) {
         writeValue(`ns=1;s=${id}`, type, value)));
     statuses.forEach((status, i) => assert.equal(status.value, 0, `write ${WRITES[i][0]}`));
     const results = await session.read(WRITES.map(([id]) => valueOf(`ns=1;s=${id}`)));
-    results.forEach((result, i) => assert.deepEqual(plain(result.value), WRITES[i][2], WRITES[i][0]));
+    results.forEach((result, i) =>
+        assert.deepEqual(plain(result.value), plainWritten(WRITES[i][2]), WRITES[i][0]));
 }
 
 async function checkRefusedWrites({ session }) {
