@@ -18,7 +18,7 @@ const {
 } = require("node-opcua");
 
 const USAGE = "usage: node anchor_client.js --url opc.tcp://... [--count N] [--seconds T]\n" +
-    "                             [--interval MS] [--warmup S]";
+    "                             [--interval MS] [--sampling MS] [--warmup S]";
 const FIRST_VALUES_TIMEOUT_MS = 120000;
 
 function parseOptions(argv) {
@@ -29,6 +29,7 @@ function parseOptions(argv) {
             count: { type: "string", default: "10000" },
             seconds: { type: "string", default: "10" },
             interval: { type: "string", default: "100" },
+            sampling: { type: "string" },
             warmup: { type: "string", default: "3" }
         }
     });
@@ -37,10 +38,12 @@ function parseOptions(argv) {
         count: Number(values.count),
         seconds: Number(values.seconds),
         interval: Number(values.interval),
+        sampling: Number(values.sampling ?? values.interval),
         warmup: Number(values.warmup)
     };
     const valid = options.url && Number.isInteger(options.count) && options.count > 0 &&
-        options.seconds > 0 && options.interval > 0 && options.warmup >= 0;
+        options.seconds > 0 && options.interval > 0 && options.sampling >= 0 &&
+        options.warmup >= 0;
     if (!valid) {
         throw new Error(USAGE);
     }
@@ -64,7 +67,7 @@ async function checkBulkSize(session, count) {
 function monitorAll(subscription, options, counter) {
     const items = Array.from({ length: options.count }, (_, i) => bulkItem(i));
     const group = ClientMonitoredItemGroup.create(subscription, items,
-        { samplingInterval: options.interval, queueSize: 1 }, TimestampsToReturn.Both);
+        { samplingInterval: options.sampling, queueSize: 1 }, TimestampsToReturn.Both);
     const reported = new Uint8Array(options.count);
     let missing = options.count;
     return new Promise((resolve, reject) => {
