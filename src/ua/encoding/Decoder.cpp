@@ -313,6 +313,8 @@ void Decoder::operator()(Variant& v) {
         } else {
             VariantScalar(static_cast<BuiltinType>(typeId), v);
         }
+    } else if (typeId == 0) {
+        Fail("a variant holds an array of null values");
     } else {
         const auto type = static_cast<BuiltinType>(typeId);
         const uint32_t count = ArrayLength(sizeof(Variant));

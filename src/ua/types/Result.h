@@ -30,7 +30,7 @@ class Result {
 
     const T& Value() const& { return std::get<0>(state_); }
     T& Value() & { return std::get<0>(state_); }
-    T&& Value() && { return std::get<0>(std::move(state_)); }
+    T Value() && { return std::get<0>(std::move(state_)); }
     const Error& Failure() const { return std::get<1>(state_); }
 
   private:
