@@ -18,8 +18,7 @@ SubscriptionInfo Revised(uint32_t subscriptionId, double interval, uint32_t life
 
 SubscriptionEngine::SubscriptionEngine(asio::io_context& io, std::shared_ptr<Session> session,
                                        const ClientOptions& options, Deliver deliver)
-    : io_(io),
-      session_(std::move(session)),
+    : session_(std::move(session)),
       options_(options),
       deliver_(std::move(deliver)),
       retryTimer_(io),

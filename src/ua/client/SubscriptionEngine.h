@@ -56,7 +56,6 @@ class SubscriptionEngine : public std::enable_shared_from_this<SubscriptionEngin
     uint32_t PublishTimeoutMs() const;
     void RetryLater();
 
-    asio::io_context& io_;
     std::shared_ptr<Session> session_;
     ClientOptions options_;
     Deliver deliver_;

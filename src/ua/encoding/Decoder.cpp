@@ -330,11 +330,15 @@ void Decoder::operator()(Variant& v) {
         std::vector<int32_t> dimensions;
         if (mask & 0x40) {
             (*this)(dimensions);
-            int64_t product = dimensions.empty() ? -1 : 1;
+            // A product above any element count counts as too large.
+            constexpr int64_t kBeyondAnyCount = int64_t{1} << 32;
+            bool valid = !dimensions.empty();
+            int64_t product = 1;
             for (const int32_t dimension : dimensions) {
-                product = dimension < 0 ? -1 : std::min<int64_t>(product * dimension, 1ll << 40);
+                valid = valid && dimension >= 0;
+                product = std::min(product * std::max(dimension, 0), kBeyondAnyCount);
             }
-            if (Ok() && product != static_cast<int64_t>(count)) {
+            if (Ok() && (!valid || product != static_cast<int64_t>(count))) {
                 Fail("the array dimensions do not match the number of elements");
             }
         }
