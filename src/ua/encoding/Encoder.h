@@ -17,8 +17,6 @@ class Encoder {
   public:
     explicit Encoder(std::string& out) : out_(out) {}
 
-    size_t Size() const { return out_.size(); }
-    std::string& Buffer() { return out_; }
 
     void operator()(bool v) { Byte(v ? 1 : 0); }
     void operator()(int8_t v) { Byte(static_cast<uint8_t>(v)); }
