@@ -126,6 +126,15 @@ TEST_F(ScriptedSession, SendsAFreshNonceAndTheEndpointsAnonymousPolicy) {
     EXPECT_EQ(token.Value().policyId, "anon");
 }
 
+TEST_F(ScriptedSession, RefusesASecondConnectUntilClosed) {
+    Start(nullptr);
+    auto again =
+        Await<SessionInfo>(queue_, [&](auto done) { client_->Connect(server_->Url(), done); });
+    ASSERT_FALSE(again);
+    EXPECT_EQ(again.Failure().status, status::BadInvalidState);
+    EXPECT_TRUE(Read());
+}
+
 TEST_F(ScriptedSession, DestroyingTheClientWithRequestsPendingCallsNothingBack) {
     Start([](ScriptedServer&, const Request& request) {
         return request.typeId == ReadRequest::kEncodingId;

@@ -48,6 +48,7 @@ class Client {
     void SetEventHandler(EventHandler handler);
 
     // Opens a secure channel (SecurityPolicy None) and an anonymous session.
+    // Refused while connected or connecting (Bad_InvalidState).
     void Connect(std::string endpointUrl, Callback<SessionInfo> done);
     // Closes the session (deleting its subscriptions) and the channel.
     void Close(std::function<void()> done);

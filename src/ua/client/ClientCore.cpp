@@ -14,11 +14,13 @@ ClientCore::ClientCore(asio::io_context& io, ClientOptions options, Deliver deli
 }
 
 void ClientCore::Connect(const std::string& sEndpointUrl, Callback<SessionInfo> done) {
-    if (session_->IsActive()) {
-        Reply(done, Result<SessionInfo>(Error{status::BadInvalidState,
-                                              "The client is connected already; close it first."}));
+    if (session_->IsActive() || connecting_) {
+        Reply(done, Result<SessionInfo>(
+                        Error{status::BadInvalidState,
+                              "The client is connected or connecting already; close it first."}));
         return;
     }
+    connecting_ = true;
     session_->Abort();
     engine_->Stop();
     session_ = std::make_shared<Session>(
@@ -30,6 +32,7 @@ void ClientCore::Connect(const std::string& sEndpointUrl, Callback<SessionInfo> 
     engine_ = std::make_shared<SubscriptionEngine>(io_, session_, options_, deliver_);
     session_->Connect(sEndpointUrl, [weak = weak_from_this(), done](Result<SessionInfo> info) {
         if (auto self = weak.lock()) {
+            self->connecting_ = false;
             self->Reply(done, std::move(info));
         }
     });
@@ -45,6 +48,7 @@ void ClientCore::OnEvent(ConnectionEvent event, const Error& reason) {
 }
 
 void ClientCore::Close(std::function<void()> done) {
+    connecting_ = false;
     engine_->Stop();
     session_->Close([deliver = deliver_, done = std::move(done)] { deliver(done); });
 }

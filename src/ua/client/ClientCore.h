@@ -83,6 +83,7 @@ class ClientCore : public std::enable_shared_from_this<ClientCore> {
     std::shared_ptr<Session> session_;
     std::shared_ptr<SubscriptionEngine> engine_;
     std::set<std::shared_ptr<SecureChannel>> discovery_;
+    bool connecting_ = false;
 };
 
 }  // namespace cv::ua
