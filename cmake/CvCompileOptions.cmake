@@ -12,3 +12,7 @@ if(CV_SANITIZE)
     add_compile_options(-fsanitize=address,undefined -fno-sanitize-recover=all -fno-omit-frame-pointer)
     add_link_options(-fsanitize=address,undefined)
 endif()
+if(CV_BUILD_FUZZ)
+    # Every library reports its coverage to libFuzzer, not only the target's own file.
+    add_compile_options(-fsanitize=fuzzer-no-link)
+endif()

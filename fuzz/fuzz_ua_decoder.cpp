@@ -1,0 +1,119 @@
+// Feeds arbitrary bytes to the OPC UA decoding paths: the first byte picks
+// the path, the rest is a received byte stream (cut into frames, joined into
+// messages, decoded as every response the client knows) or one encoded
+// value. Checks that what decodes encodes to a form that decodes to the
+// same encoding again.
+
+#include <cstdint>
+#include <cstdlib>
+#include <string>
+#include <string_view>
+
+#include "ua/encoding/Decoder.h"
+#include "ua/encoding/Encoder.h"
+#include "ua/secure/ChunkAssembler.h"
+#include "ua/secure/NoneSecurityPolicy.h"
+#include "ua/services/AttributeServices.h"
+#include "ua/services/MonitoredItemServices.h"
+#include "ua/services/ServiceMessages.h"
+#include "ua/services/SessionServices.h"
+#include "ua/services/SubscriptionServices.h"
+#include "ua/services/ViewServices.h"
+#include "ua/transport/TcpMessages.h"
+
+namespace {
+
+using namespace cv::ua;
+
+void Check(bool bCondition) {
+    if (!bCondition) {
+        std::abort();
+    }
+}
+
+DecodeLimits Limits() {
+    DecodeLimits limits;
+    limits.maxStringLength = 1u << 16;
+    limits.maxArrayLength = 1u << 16;
+    limits.maxAllocation = 64u << 20;
+    return limits;
+}
+
+template <class T>
+void RoundTrip(std::string_view bytes) {
+    auto decoded = Decode<T>(bytes, Limits());
+    if (!decoded) {
+        return;
+    }
+    const std::string encoded = Encode(decoded.Value());
+    auto again = Decode<T>(encoded, Limits());
+    Check(again.Ok());
+    Check(Encode(again.Value()) == encoded);
+}
+
+template <class... Responses>
+void DecodeResponses(std::string_view body) {
+    (DecodeResponse<Responses>(body, "fuzz", Limits()), ...);
+}
+
+void Stream(std::string_view bytes) {
+    NoneSecurityPolicy policy;
+    ChunkAssembler assembler(policy);
+    assembler.SetLimits(1u << 20, 64);
+    assembler.AcceptToken(1);
+    FrameReader reader(1u << 16);
+    reader.Append(bytes);
+    for (;;) {
+        auto frame = reader.Next();
+        if (!frame || !frame.Value()) {
+            return;
+        }
+        const MessageKind kind = frame.Value()->header.kind;
+        if (kind == MessageKind::Acknowledge || kind == MessageKind::Error ||
+            kind == MessageKind::Hello) {
+            RoundTrip<AcknowledgeMessage>(
+                std::string_view(frame.Value()->bytes).substr(kFrameHeaderSize));
+            RoundTrip<ErrorMessage>(
+                std::string_view(frame.Value()->bytes).substr(kFrameHeaderSize));
+            continue;
+        }
+        auto outcome = assembler.Add(std::move(*frame.Value()));
+        if (!outcome) {
+            return;
+        }
+        if (outcome.Value().message) {
+            DecodeResponses<OpenSecureChannelResponse, GetEndpointsResponse, FindServersResponse,
+                            CreateSessionResponse, ActivateSessionResponse, CloseSessionResponse,
+                            BrowseResponse, BrowseNextResponse, TranslateBrowsePathsResponse,
+                            ReadResponse, WriteResponse, CreateSubscriptionResponse,
+                            ModifySubscriptionResponse, DeleteSubscriptionsResponse,
+                            CreateMonitoredItemsResponse, SetMonitoringModeResponse,
+                            DeleteMonitoredItemsResponse, PublishResponse, RepublishResponse>(
+                outcome.Value().message->body);
+        }
+    }
+}
+
+}  // namespace
+
+extern "C" int LLVMFuzzerTestOneInput(const uint8_t* data, size_t size) {
+    if (size == 0) {
+        return 0;
+    }
+    const std::string_view bytes(reinterpret_cast<const char*>(data) + 1, size - 1);
+    switch (data[0] % 4) {
+        case 0:
+            Stream(bytes);
+            break;
+        case 1:
+            RoundTrip<Variant>(bytes);
+            break;
+        case 2:
+            RoundTrip<DataValue>(bytes);
+            break;
+        default:
+            RoundTrip<PublishResponse>(bytes);
+            break;
+    }
+    return 0;
+}

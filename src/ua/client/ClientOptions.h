@@ -1,0 +1,31 @@
+#pragma once
+
+#include <cstdint>
+#include <functional>
+#include <string>
+
+#include "ua/secure/ChannelOptions.h"
+
+namespace cv::ua {
+
+// Runs a completion on the caller's thread (the window thread's event loop
+// in the program). Called from the client's I/O thread; it must queue the
+// function, never run it at once.
+using Dispatcher = std::function<void(std::function<void()>)>;
+
+struct ClientOptions {
+    std::string applicationUri = "urn:cvopctestclient:client";
+    std::string applicationName = "Corvalent OPC Test Client";
+    std::string sessionName = "cvopctestclient";
+    ChannelOptions channel;
+    // Every service request; Publish waits longer (see SubscriptionEngine).
+    uint32_t requestTimeoutMs = 10'000;
+    uint32_t requestedSessionTimeoutMs = 120'000;
+    // How often an idle session reads the server's state (at least three
+    // times per session time-out).
+    uint32_t keepAliveIntervalMs = 5'000;
+    // Publish requests kept at the server while subscriptions exist.
+    uint32_t publishRequests = 4;
+};
+
+}  // namespace cv::ua
