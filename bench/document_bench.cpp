@@ -11,38 +11,13 @@
 #include <string>
 
 #include "document/TunFile.h"
-#include "platform/fake/FixedComputerName.h"
-#include "platform/fake/FixedLocale.h"
-#include "platform/fake/FixedProgramInfo.h"
-#include "platform/fake/RecordingHelp.h"
-#include "platform/fake/ScriptedDialogs.h"
-#include "platform/fake/VirtualEventLoop.h"
-#include "platform/posix/FileProfiles.h"
-#include "platform/posix/FileRegistry.h"
-#include "support/TempFolder.h"
+#include "support/TestPlatform.h"
 
 namespace {
 
 constexpr int32_t kChannels = 200;
 constexpr int32_t kLoops = 20;
 constexpr int32_t kOpcTuner = 9;
-
-// Fakes for everything but the files, which are real ones in a temporary
-// folder.
-struct BenchPlatform {
-    cv::fake::ScriptedDialogs dialogs;
-    cv::fake::FixedLocale locale = cv::fake::FixedLocale::Point();
-    cv::fake::FixedProgramInfo program;
-    cv::fake::RecordingHelp help;
-    cv::fake::FixedComputerName computer;
-    cv::fake::VirtualEventLoop events;
-    cv::test::TempFolder folder;
-    cv::posix::FileRegistry registry{folder.Path()};
-    cv::posix::FileProfiles profiles{folder.Path()};
-    cv::RunSwitches run;
-    cv::Platform platform{dialogs, locale,   program,  help, computer,
-                          events,  registry, profiles, run};
-};
 
 // A document of kChannels charted channels and kLoops loops, saved once.
 struct SavedDocument {
@@ -66,7 +41,7 @@ struct SavedDocument {
         }
         document.WriteToDisk(path);
     }
-    BenchPlatform tp;
+    cv::test::TestPlatform tp;
     std::string path;
 };
 
@@ -81,7 +56,7 @@ BENCHMARK(BM_ReadDocumentWarm)->Unit(benchmark::kMillisecond);
 
 void BM_ReadDocumentCold(benchmark::State& state) {
     SavedDocument saved;
-    BenchPlatform& tp = saved.tp;
+    cv::test::TestPlatform& tp = saved.tp;
     for (auto _ : state) {
         cv::posix::FileProfiles profiles(tp.folder.Path());
         cv::Platform platform{tp.dialogs, tp.locale,   tp.program, tp.help, tp.computer,
