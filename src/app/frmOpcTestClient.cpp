@@ -1,4 +1,8 @@
 #include "app/frmOpcTestClient.h"
+#include "platform/Platform.h"
+#include "ui/widgets/HelpTopics.h"
+#include "util/FloatText.h"
+#include "util/ProgramRoutines.h"
 
 #include <QCheckBox>
 #include <QGridLayout>
@@ -9,8 +13,6 @@
 #include <QPushButton>
 #include <QVBoxLayout>
 #include <array>
-
-#include "app/Utility.h"
 
 namespace cv {
 

@@ -7,7 +7,6 @@
 
 #include "channel/Channel.h"
 #include "document/TunFile.h"
-#include "platform/Platform.h"
 
 class QCheckBox;
 class QCloseEvent;
@@ -17,6 +16,8 @@ class QLineEdit;
 class QPushButton;
 
 namespace cv {
+
+struct Platform;
 
 // The main window: names one OPC item (server, access path, item ID), its
 // scaling ranges and the sample interval, and starts the test read. Each

@@ -4,8 +4,10 @@
 #include <QLineEdit>
 #include <cmath>
 
-#include "app/Utility.h"
 #include "app/frmOpcTestClient.h"
+#include "platform/Platform.h"
+#include "util/FloatText.h"
+#include "util/TextToNumber.h"
 
 namespace cv {
 

@@ -11,8 +11,8 @@
 #include <cstdlib>
 #include <string_view>
 
-#include "app/Utility.h"
 #include "app/frmOpcTestClient.h"
+#include "platform/Platform.h"
 #include "platform/posix/FileProfiles.h"
 #include "platform/posix/FileRegistry.h"
 #include "platform/posix/HostComputerName.h"
@@ -21,6 +21,7 @@
 #include "platform/qt/QtDialogs.h"
 #include "platform/qt/QtEventLoop.h"
 #include "platform/qt/QtLocale.h"
+#include "util/ProgramRoutines.h"
 
 namespace {
 

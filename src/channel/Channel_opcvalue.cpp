@@ -1,5 +1,6 @@
-#include "app/Utility.h"
 #include "channel/Channel.h"
+#include "platform/Platform.h"
+#include "util/ProgramRoutines.h"
 
 namespace cv {
 

@@ -5,11 +5,11 @@
 #include <vector>
 
 #include "document/LoopClass.h"
-#include "platform/Platform.h"
 
 namespace cv {
 
 class TunFile;
+struct Platform;
 
 // The loops of a tuning document, numbered 1 to Count without gaps, and the
 // number of the current one (0 while there is none). The collection owns

@@ -1,6 +1,5 @@
 #include "document/TunFile.h"
 
-#include "app/Utility.h"
 #include "document/CorvalentIni.h"
 
 namespace cv {

@@ -11,10 +11,11 @@
 #include "document/SpecificChannels.h"
 #include "document/TunFileGeneral.h"
 #include "document/TunerType.h"
-#include "platform/Platform.h"
 #include "stores/IniFile.h"
 
 namespace cv {
+
+struct Platform;
 
 // The tuning document: owns the charted channels, the loop-specific
 // channels, the loops, the INI store of its tuning file, the tuner kind, the

@@ -1,4 +1,5 @@
 #include "document/TunFileGeneral.h"
+#include "platform/Platform.h"
 
 #include <cmath>
 

@@ -2,6 +2,7 @@
 
 #include "document/TunFileGeneral.h"
 #include "document/TunerType.h"
+#include "platform/Platform.h"
 #include "stores/IniFile.h"
 
 namespace cv {

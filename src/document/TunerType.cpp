@@ -1,4 +1,5 @@
 #include "document/TunerType.h"
+#include "platform/Platform.h"
 
 #include <array>
 

@@ -7,8 +7,8 @@
 #include <QWidget>
 #include <string>
 
-#include "app/Utility.h"
 #include "document/LoopClass.h"
+#include "util/FloatText.h"
 
 namespace cv {
 

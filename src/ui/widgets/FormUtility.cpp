@@ -1,4 +1,4 @@
-#include "app/FormUtility.h"
+#include "ui/widgets/FormUtility.h"
 
 #include <QComboBox>
 #include <QGroupBox>

@@ -3,8 +3,9 @@
 #include <cfloat>
 #include <cmath>
 
-#include "app/Utility.h"
 #include "support/TestPlatform.h"
+#include "util/FloatText.h"
+#include "util/TextToNumber.h"
 
 namespace cv {
 namespace {
