@@ -17,23 +17,23 @@ namespace {
 
 constexpr int kMaxLinkHops = 40;
 
-std::string FolderOf(const std::string& sPath) {
-    const auto slash = sPath.rfind('/');
+std::string FolderOf(const std::string& path) {
+    const auto slash = path.rfind('/');
     if (slash == std::string::npos) {
         return ".";
     }
-    return slash == 0 ? "/" : sPath.substr(0, slash);
+    return slash == 0 ? "/" : path.substr(0, slash);
 }
 
-std::string NameOf(const std::string& sPath) {
-    const auto slash = sPath.rfind('/');
-    return slash == std::string::npos ? sPath : sPath.substr(slash + 1);
+std::string NameOf(const std::string& path) {
+    const auto slash = path.rfind('/');
+    return slash == std::string::npos ? path : path.substr(slash + 1);
 }
 
 // Follows symbolic links (dangling ones too) to the path that really holds
 // the file, so that replacing it keeps the links.
-std::string ResolveTarget(const std::string& sPath) {
-    std::string target = sPath;
+std::string ResolveTarget(const std::string& path) {
+    std::string target = path;
     for (int hop = 0; hop < kMaxLinkHops; ++hop) {
         struct stat info {};
         if (::lstat(target.c_str(), &info) != 0 || !S_ISLNK(info.st_mode)) {
@@ -50,9 +50,9 @@ std::string ResolveTarget(const std::string& sPath) {
     return target;
 }
 
-int ReadDescriptor(int iFd, std::string& sText) {
+int ReadDescriptor(int fd, std::string& out) {
     struct stat info {};
-    if (::fstat(iFd, &info) != 0) {
+    if (::fstat(fd, &info) != 0) {
         return errno;
     }
     if (S_ISDIR(info.st_mode)) {
@@ -62,7 +62,7 @@ int ReadDescriptor(int iFd, std::string& sText) {
     text.reserve(static_cast<size_t>(std::clamp<int64_t>(info.st_size, 0, AtomicFile::kMaxBytes)));
     std::array<char, 65536> block{};
     for (;;) {
-        const ssize_t got = ::read(iFd, block.data(), block.size());
+        const ssize_t got = ::read(fd, block.data(), block.size());
         if (got < 0 && errno == EINTR) {
             continue;
         }
@@ -77,37 +77,37 @@ int ReadDescriptor(int iFd, std::string& sText) {
         }
         text.append(block.data(), static_cast<size_t>(got));
     }
-    sText = std::move(text);
+    out = std::move(text);
     return 0;
 }
 
-int WriteAll(int iFd, std::string_view sText) {
-    while (!sText.empty()) {
-        const ssize_t put = ::write(iFd, sText.data(), sText.size());
+int WriteAll(int fd, std::string_view text) {
+    while (!text.empty()) {
+        const ssize_t put = ::write(fd, text.data(), text.size());
         if (put < 0 && errno == EINTR) {
             continue;
         }
         if (put < 0) {
             return errno;
         }
-        sText.remove_prefix(static_cast<size_t>(put));
+        text.remove_prefix(static_cast<size_t>(put));
     }
     return 0;
 }
 
 // Makes a rename in the folder durable; file systems that cannot do this
 // still keep the rename atomic, so a failure here is not an error.
-void SyncFolder(const std::string& sFolder) {
-    const UniqueFd folder(::open(sFolder.c_str(), O_RDONLY | O_DIRECTORY | O_CLOEXEC));
-    if (folder.Valid()) {
-        ::fsync(folder.Get());
+void SyncFolder(const std::string& folder) {
+    const UniqueFd handle(::open(folder.c_str(), O_RDONLY | O_DIRECTORY | O_CLOEXEC));
+    if (handle.Valid()) {
+        ::fsync(handle.Get());
     }
 }
 
-bool SameInode(int iFd, const std::string& sPath) {
+bool SameInode(int fd, const std::string& path) {
     struct stat held {};
     struct stat current {};
-    return ::fstat(iFd, &held) == 0 && ::stat(sPath.c_str(), &current) == 0 &&
+    return ::fstat(fd, &held) == 0 && ::stat(path.c_str(), &current) == 0 &&
            held.st_dev == current.st_dev && held.st_ino == current.st_ino;
 }
 
@@ -122,8 +122,8 @@ std::string TimeTag() {
 
 }  // namespace
 
-AtomicFile::AtomicFile(std::string sPath, NewFileMode eNewMode)
-    : msPath(std::move(sPath)), meNewMode(eNewMode) {}
+AtomicFile::AtomicFile(std::string path, NewFileMode newMode)
+    : path_(std::move(path)), newMode_(newMode) {}
 
 AtomicFile::~AtomicFile() {
     Unlock();
@@ -131,36 +131,36 @@ AtomicFile::~AtomicFile() {
 
 FileRead AtomicFile::Read() const {
     FileRead result;
-    const std::string& path = Locked() ? msLockedTarget : msPath;
+    const std::string& path = Locked() ? lockedTarget_ : path_;
     auto file = std::make_shared<UniqueFd>(::open(path.c_str(), O_RDONLY | O_CLOEXEC | O_NOCTTY));
     if (!file->Valid()) {
-        result.Error = errno;
-        const bool missing = result.Error == ENOENT || result.Error == ENOTDIR;
-        result.Status = missing ? ReadStatus::Missing : ReadStatus::Unreadable;
+        result.error = errno;
+        const bool missing = result.error == ENOENT || result.error == ENOTDIR;
+        result.status = missing ? ReadStatus::Missing : ReadStatus::Unreadable;
         return result;
     }
     struct stat info {};
-    result.Error =
-        ::fstat(file->Get(), &info) == 0 ? ReadDescriptor(file->Get(), result.Text) : errno;
-    if (result.Error != 0) {
-        result.Status = ReadStatus::Unreadable;
-        result.Text.clear();
+    result.error =
+        ::fstat(file->Get(), &info) == 0 ? ReadDescriptor(file->Get(), result.text) : errno;
+    if (result.error != 0) {
+        result.status = ReadStatus::Unreadable;
+        result.text.clear();
         return result;
     }
-    result.Status = ReadStatus::Read;
-    result.Stamp = FileStamp::OfStat(info, std::move(file));
+    result.status = ReadStatus::Read;
+    result.stamp = FileStamp::OfStat(info, std::move(file));
     return result;
 }
 
 FileStamp AtomicFile::Stamp() const {
     if (!Locked()) {
-        return FileStamp::OfPath(msPath);
+        return FileStamp::OfPath(path_);
     }
     auto pin =
-        std::make_shared<UniqueFd>(::open(msLockedTarget.c_str(), O_RDONLY | O_CLOEXEC | O_NOCTTY));
+        std::make_shared<UniqueFd>(::open(lockedTarget_.c_str(), O_RDONLY | O_CLOEXEC | O_NOCTTY));
     struct stat info {};
     if (!pin->Valid() || ::fstat(pin->Get(), &info) != 0) {
-        return FileStamp::OfPath(msLockedTarget);
+        return FileStamp::OfPath(lockedTarget_);
     }
     return FileStamp::OfStat(info, std::move(pin));
 }
@@ -169,14 +169,14 @@ int AtomicFile::Lock() {
     if (Locked()) {
         return 0;
     }
-    return LockTarget(ResolveTarget(msPath));
+    return LockTarget(ResolveTarget(path_));
 }
 
-int AtomicFile::LockTarget(const std::string& sTarget) {
+int AtomicFile::LockTarget(const std::string& target) {
     const auto deadline = std::chrono::steady_clock::now() + std::chrono::milliseconds(kLockWaitMs);
     for (;;) {
         UniqueFd file;
-        const int error = OpenForLock(sTarget, file);
+        const int error = OpenForLock(target, file);
         if (error != 0) {
             return error;
         }
@@ -194,30 +194,29 @@ int AtomicFile::LockTarget(const std::string& sTarget) {
             std::this_thread::sleep_for(std::chrono::milliseconds(pauseMs));
             pauseMs = std::min(pauseMs * 2, 50);
         }
-        if (SameInode(file.Get(), sTarget)) {
-            mcLock = std::move(file);
-            msLockedTarget = sTarget;
+        if (SameInode(file.Get(), target)) {
+            lock_ = std::move(file);
+            lockedTarget_ = target;
             return 0;
         }
     }
 }
 
-int AtomicFile::OpenForLock(const std::string& sTarget, UniqueFd& cFd) {
-    const mode_t mode = meNewMode == NewFileMode::OwnerOnly ? 0600 : 0666;
+int AtomicFile::OpenForLock(const std::string& target, UniqueFd& fd) {
+    const mode_t mode = newMode_ == NewFileMode::OwnerOnly ? 0600 : 0666;
     for (;;) {
-        cFd.Reset(::open(sTarget.c_str(), O_RDONLY | O_CLOEXEC | O_NOCTTY));
-        if (cFd.Valid()) {
-            mbCreatedEmpty = false;
+        fd.Reset(::open(target.c_str(), O_RDONLY | O_CLOEXEC | O_NOCTTY));
+        if (fd.Valid()) {
+            createdEmpty_ = false;
             struct stat info {};
-            return ::fstat(cFd.Get(), &info) != 0 ? errno : S_ISDIR(info.st_mode) ? EISDIR : 0;
+            return ::fstat(fd.Get(), &info) != 0 ? errno : S_ISDIR(info.st_mode) ? EISDIR : 0;
         }
         if (errno != ENOENT) {
             return errno;
         }
-        cFd.Reset(
-            ::open(sTarget.c_str(), O_RDONLY | O_CREAT | O_EXCL | O_CLOEXEC | O_NOCTTY, mode));
-        if (cFd.Valid()) {
-            mbCreatedEmpty = true;
+        fd.Reset(::open(target.c_str(), O_RDONLY | O_CREAT | O_EXCL | O_CLOEXEC | O_NOCTTY, mode));
+        if (fd.Valid()) {
+            createdEmpty_ = true;
             return 0;
         }
         if (errno != EEXIST) {
@@ -231,16 +230,16 @@ void AtomicFile::Unlock() {
         return;
     }
     struct stat info {};
-    if (mbCreatedEmpty && ::fstat(mcLock.Get(), &info) == 0 && info.st_size == 0 &&
-        SameInode(mcLock.Get(), msLockedTarget)) {
-        ::unlink(msLockedTarget.c_str());
+    if (createdEmpty_ && ::fstat(lock_.Get(), &info) == 0 && info.st_size == 0 &&
+        SameInode(lock_.Get(), lockedTarget_)) {
+        ::unlink(lockedTarget_.c_str());
     }
-    mcLock.Reset();
-    msLockedTarget.clear();
-    mbCreatedEmpty = false;
+    lock_.Reset();
+    lockedTarget_.clear();
+    createdEmpty_ = false;
 }
 
-int AtomicFile::Replace(std::string_view sText) {
+int AtomicFile::Replace(std::string_view text) {
     const bool ownLock = !Locked();
     int error = Lock();
     if (error != 0) {
@@ -248,20 +247,20 @@ int AtomicFile::Replace(std::string_view sText) {
     }
     UniqueFd temp;
     std::string tempPath;
-    if (::access(msLockedTarget.c_str(), W_OK) != 0) {
+    if (::access(lockedTarget_.c_str(), W_OK) != 0) {
         error = errno;
     } else {
-        error = WriteTemporary(sText, temp, tempPath);
+        error = WriteTemporary(text, temp, tempPath);
     }
     if (error == 0 && (::flock(temp.Get(), LOCK_EX | LOCK_NB) != 0 ||
-                       ::rename(tempPath.c_str(), msLockedTarget.c_str()) != 0)) {
+                       ::rename(tempPath.c_str(), lockedTarget_.c_str()) != 0)) {
         error = errno;
         ::unlink(tempPath.c_str());
     }
     if (error == 0) {
-        SyncFolder(FolderOf(msLockedTarget));
-        mcLock = std::move(temp);
-        mbCreatedEmpty = false;
+        SyncFolder(FolderOf(lockedTarget_));
+        lock_ = std::move(temp);
+        createdEmpty_ = false;
     }
     if (ownLock) {
         Unlock();
@@ -269,47 +268,45 @@ int AtomicFile::Replace(std::string_view sText) {
     return error;
 }
 
-int AtomicFile::WriteTemporary(std::string_view sText, UniqueFd& cTemp,
-                               std::string& sTempPath) const {
-    sTempPath = FolderOf(msLockedTarget) + "/." + NameOf(msLockedTarget) + ".cv-tmp";
-    ::unlink(sTempPath.c_str());
-    cTemp.Reset(
-        ::open(sTempPath.c_str(), O_RDWR | O_CREAT | O_EXCL | O_NOFOLLOW | O_CLOEXEC, 0600));
-    if (!cTemp.Valid()) {
+int AtomicFile::WriteTemporary(std::string_view text, UniqueFd& temp, std::string& tempPath) const {
+    tempPath = FolderOf(lockedTarget_) + "/." + NameOf(lockedTarget_) + ".cv-tmp";
+    ::unlink(tempPath.c_str());
+    temp.Reset(::open(tempPath.c_str(), O_RDWR | O_CREAT | O_EXCL | O_NOFOLLOW | O_CLOEXEC, 0600));
+    if (!temp.Valid()) {
         return errno;
     }
     struct stat held {};
-    int error = ::fstat(mcLock.Get(), &held) != 0 ? errno : 0;
-    if (error == 0 && ::fchmod(cTemp.Get(), held.st_mode & 07777) != 0) {
+    int error = ::fstat(lock_.Get(), &held) != 0 ? errno : 0;
+    if (error == 0 && ::fchmod(temp.Get(), held.st_mode & 07777) != 0) {
         error = errno;
     }
     if (error == 0) {
-        error = WriteAll(cTemp.Get(), sText);
+        error = WriteAll(temp.Get(), text);
     }
-    if (error == 0 && ::fsync(cTemp.Get()) != 0) {
+    if (error == 0 && ::fsync(temp.Get()) != 0) {
         error = errno;
     }
     if (error != 0) {
-        cTemp.Reset();
-        ::unlink(sTempPath.c_str());
+        temp.Reset();
+        ::unlink(tempPath.c_str());
     }
     return error;
 }
 
-int AtomicFile::SetAside(std::string& sAsidePath) {
+int AtomicFile::SetAside(std::string& asidePath) {
     const bool ownLock = !Locked();
     int error = Lock();
     if (error != 0) {
         return error;
     }
     const FileRead current = Read();
-    error = current.Status == ReadStatus::Read ? 0 : current.Error;
-    const std::string base = msLockedTarget + ".damaged-" + TimeTag();
+    error = current.status == ReadStatus::Read ? 0 : current.error;
+    const std::string base = lockedTarget_ + ".damaged-" + TimeTag();
     for (int attempt = 1; error == 0; ++attempt) {
         const std::string candidate = attempt == 1 ? base : base + "-" + std::to_string(attempt);
-        error = CopyTo(current.Text, candidate);
+        error = CopyTo(current.text, candidate);
         if (error == 0) {
-            sAsidePath = candidate;
+            asidePath = candidate;
             break;
         }
         error = error == EEXIST && attempt < 1000 ? 0 : error;
@@ -320,24 +317,24 @@ int AtomicFile::SetAside(std::string& sAsidePath) {
     return error;
 }
 
-int AtomicFile::CopyTo(const std::string& sText, const std::string& sAsidePath) const {
-    const UniqueFd copy(::open(sAsidePath.c_str(), O_WRONLY | O_CREAT | O_EXCL | O_CLOEXEC, 0600));
+int AtomicFile::CopyTo(const std::string& text, const std::string& asidePath) const {
+    const UniqueFd copy(::open(asidePath.c_str(), O_WRONLY | O_CREAT | O_EXCL | O_CLOEXEC, 0600));
     if (!copy.Valid()) {
         return errno;
     }
-    int error = WriteAll(copy.Get(), sText);
+    int error = WriteAll(copy.Get(), text);
     if (error == 0 && ::fsync(copy.Get()) != 0) {
         error = errno;
     }
     if (error != 0) {
-        ::unlink(sAsidePath.c_str());
+        ::unlink(asidePath.c_str());
     }
     return error;
 }
 
-int AtomicFile::MakeFolders(const std::string& sFolder) {
-    for (size_t slash = sFolder.find('/', 1);; slash = sFolder.find('/', slash + 1)) {
-        const std::string prefix = sFolder.substr(0, slash);
+int AtomicFile::MakeFolders(const std::string& folder) {
+    for (size_t slash = folder.find('/', 1);; slash = folder.find('/', slash + 1)) {
+        const std::string prefix = folder.substr(0, slash);
         if (!prefix.empty() && ::mkdir(prefix.c_str(), 0700) != 0 && errno != EEXIST) {
             return errno;
         }
@@ -346,7 +343,7 @@ int AtomicFile::MakeFolders(const std::string& sFolder) {
         }
     }
     struct stat info {};
-    if (::stat(sFolder.c_str(), &info) != 0) {
+    if (::stat(folder.c_str(), &info) != 0) {
         return errno;
     }
     return S_ISDIR(info.st_mode) ? 0 : ENOTDIR;

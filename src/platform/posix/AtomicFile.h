@@ -22,10 +22,10 @@ enum class NewFileMode {
 };
 
 struct FileRead {
-    ReadStatus Status = ReadStatus::Missing;
-    std::string Text;
-    FileStamp Stamp;  // of the version read; missing unless Status is Read
-    int Error = 0;    // errno behind Unreadable
+    ReadStatus status = ReadStatus::Missing;
+    std::string text;
+    FileStamp stamp;  // of the version read; missing unless status is Read
+    int error = 0;    // errno behind Unreadable
 };
 
 // One file that is only ever replaced whole, never torn, and whose
@@ -55,12 +55,12 @@ class AtomicFile {
     // How long Lock waits for another holder before giving up with ETIMEDOUT.
     static constexpr int kLockWaitMs = 10000;
 
-    explicit AtomicFile(std::string sPath, NewFileMode eNewMode = NewFileMode::OwnerOnly);
+    explicit AtomicFile(std::string path, NewFileMode newMode = NewFileMode::OwnerOnly);
     ~AtomicFile();
     AtomicFile(const AtomicFile&) = delete;
     AtomicFile& operator=(const AtomicFile&) = delete;
 
-    const std::string& Path() const { return msPath; }
+    const std::string& Path() const { return path_; }
 
     // The whole file. Needs no lock: writers only ever rename whole files in.
     // While this object holds the lock, reads the locked version.
@@ -72,30 +72,30 @@ class AtomicFile {
 
     int Lock();
     void Unlock();
-    bool Locked() const { return mcLock.Valid(); }
+    bool Locked() const { return lock_.Valid(); }
 
-    // Puts sText in place atomically. Takes the lock for the call when not
+    // Puts text in place atomically. Takes the lock for the call when not
     // held. Refuses (EACCES) a file the user has made read-only.
-    int Replace(std::string_view sText);
+    int Replace(std::string_view text);
     // Keeps a copy of the current file as "<path>.damaged-YYYYMMDD-HHMMSS"
     // (with "-2", "-3", ... when taken), so that a following Replace cannot
-    // lose it; sAsidePath receives the copy's path.
-    int SetAside(std::string& sAsidePath);
+    // lose it; asidePath receives the copy's path.
+    int SetAside(std::string& asidePath);
 
-    // Creates sFolder and its missing parents with mode 0700.
-    static int MakeFolders(const std::string& sFolder);
+    // Creates folder and its missing parents with mode 0700.
+    static int MakeFolders(const std::string& folder);
 
   private:
-    int LockTarget(const std::string& sTarget);
-    int OpenForLock(const std::string& sTarget, UniqueFd& cFd);
-    int WriteTemporary(std::string_view sText, UniqueFd& cTemp, std::string& sTempPath) const;
-    int CopyTo(const std::string& sText, const std::string& sAsidePath) const;
+    int LockTarget(const std::string& target);
+    int OpenForLock(const std::string& target, UniqueFd& fd);
+    int WriteTemporary(std::string_view text, UniqueFd& temp, std::string& tempPath) const;
+    int CopyTo(const std::string& text, const std::string& asidePath) const;
 
-    std::string msPath;
-    NewFileMode meNewMode;
-    UniqueFd mcLock;
-    std::string msLockedTarget;
-    bool mbCreatedEmpty = false;
+    std::string path_;
+    NewFileMode newMode_;
+    UniqueFd lock_;
+    std::string lockedTarget_;
+    bool createdEmpty_ = false;
 };
 
 }  // namespace cv::posix

@@ -23,20 +23,20 @@ TEST(AtomicFile, ReplacesWholeFilesAndStampsEachVersion) {
     test::TempFolder folder;
     Spill(folder.File(".settings.cv-tmp"), "half a write left by a crash");
     AtomicFile file(folder.File("settings"));
-    EXPECT_EQ(file.Read().Status, ReadStatus::Missing);
+    EXPECT_EQ(file.Read().status, ReadStatus::Missing);
     EXPECT_FALSE(file.Stamp().Exists());
 
     ASSERT_EQ(file.Replace("first"), 0);
     EXPECT_EQ(ModeOf(file.Path()), 0600u);
     const FileRead first = file.Read();
-    EXPECT_EQ(first.Status, ReadStatus::Read);
-    EXPECT_EQ(first.Text, "first");
-    EXPECT_EQ(first.Stamp, file.Stamp());
+    EXPECT_EQ(first.status, ReadStatus::Read);
+    EXPECT_EQ(first.text, "first");
+    EXPECT_EQ(first.stamp, file.Stamp());
 
     // Same size, written at once: the stamp still tells the versions apart.
     for (char c = 'a'; c < 'f'; ++c) {
         ASSERT_EQ(file.Replace(std::string(5, c)), 0);
-        EXPECT_FALSE(first.Stamp == file.Stamp());
+        EXPECT_FALSE(first.stamp == file.Stamp());
     }
     EXPECT_EQ(Slurp(file.Path()), "eeeee");
     EXPECT_FALSE(file.Locked());
@@ -58,17 +58,17 @@ TEST(AtomicFile, KeepsTheModeOfExistingFilesAndTheLinksToThem) {
 
 TEST(AtomicFile, TellsMissingFromUnreadableAndRefusesReadOnlyFiles) {
     test::TempFolder folder;
-    EXPECT_EQ(AtomicFile(folder.File("no/such/file")).Read().Status, ReadStatus::Missing);
+    EXPECT_EQ(AtomicFile(folder.File("no/such/file")).Read().status, ReadStatus::Missing);
     const FileRead asFolder = AtomicFile(folder.Path()).Read();
-    EXPECT_EQ(asFolder.Status, ReadStatus::Unreadable);
-    EXPECT_EQ(asFolder.Error, EISDIR);
+    EXPECT_EQ(asFolder.status, ReadStatus::Unreadable);
+    EXPECT_EQ(asFolder.error, EISDIR);
     EXPECT_EQ(AtomicFile(folder.Path()).Replace("x"), EISDIR);
     if (::geteuid() == 0) {
         GTEST_SKIP() << "permissions do not bind root";
     }
     Spill(folder.File("locked"), "keep");
     ::chmod(folder.File("locked").c_str(), 0);
-    EXPECT_EQ(AtomicFile(folder.File("locked")).Read().Status, ReadStatus::Unreadable);
+    EXPECT_EQ(AtomicFile(folder.File("locked")).Read().status, ReadStatus::Unreadable);
     ::chmod(folder.File("locked").c_str(), 0400);
     EXPECT_EQ(AtomicFile(folder.File("locked")).Replace("lost"), EACCES);
     EXPECT_EQ(Slurp(folder.File("locked")), "keep");
@@ -85,7 +85,7 @@ TEST(AtomicFile, HoldsTheLockAcrossReplacesAndLeavesNoLockFile) {
     ASSERT_EQ(file.Lock(), 0);
     ASSERT_EQ(file.Replace("one"), 0);
     ASSERT_EQ(file.Replace("two"), 0);
-    EXPECT_EQ(file.Read().Text, "two");
+    EXPECT_EQ(file.Read().text, "two");
     // Another open file, as in another process, cannot lock the version now in place.
     const int other = ::open(file.Path().c_str(), O_RDONLY);
     EXPECT_EQ(::flock(other, LOCK_EX | LOCK_NB), -1);
