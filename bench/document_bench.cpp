@@ -7,6 +7,7 @@
 
 #include <benchmark/benchmark.h>
 
+#include <cstdlib>
 #include <memory>
 #include <string>
 
@@ -39,7 +40,9 @@ struct SavedDocument {
             loop->SetDescription("Loop " + std::to_string(k));
             loop->SetPVChannel(k + 3);
         }
-        document.WriteToDisk(path);
+        if (!document.WriteToDisk(path)) {
+            std::abort();  // nothing to measure without the file
+        }
     }
     cv::test::TestPlatform tp;
     std::string path;

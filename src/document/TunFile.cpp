@@ -64,7 +64,7 @@ bool TunFile::WriteToDisk(const std::string& sPath) {
         mcSpecifics->WriteToDisk(*this);
     }
     mcLoops->WriteToDisk(*this);
-    cSharedBatch.End();
+    static_cast<void>(cSharedBatch.End());
     if (!cBatch.End()) {
         mcIniFile.SetFileName(std::move(sFormerPath));
         ShowError("Error: TunFile.WriteToDisk");

@@ -45,7 +45,7 @@ class TunFile {
     // of the shared settings file): other programs see all of the save or
     // none of it. False, with a message and the old file name kept, when the
     // path is empty or the file could not be stored.
-    bool WriteToDisk(const std::string& sPath);
+    [[nodiscard]] bool WriteToDisk(const std::string& sPath);
     // Upgrades keys that files of version 12.07.99 and before held in an
     // older form.
     void ConvertFileFormat();

@@ -144,8 +144,10 @@ IniFile::Batch::Batch(IniFile& cIniFile)
     mcProfiles.BeginBatch(msFileName);
 }
 
+// A batch dropped without End still stores its writes; a caller that must
+// know whether they reached the file calls End.
 IniFile::Batch::~Batch() {
-    End();
+    static_cast<void>(End());
 }
 
 bool IniFile::Batch::End() {

@@ -78,7 +78,7 @@ class IniFile {
 
         // Stores the writes now; true when they reached the file. Only the
         // first call stores; later calls return false.
-        bool End();
+        [[nodiscard]] bool End();
 
       private:
         platform::ProfileApi& mcProfiles;
