@@ -17,6 +17,25 @@ namespace {
 
 constexpr int kMaxLinkHops = 40;
 
+std::error_code LastError() {
+    return {errno, std::generic_category()};
+}
+
+std::error_code ErrorOf(std::errc code) {
+    return std::make_error_code(code);
+}
+
+// Repeats a call that a signal interrupted.
+template <typename Call>
+auto Retrying(Call call) {
+    for (;;) {
+        const auto result = call();
+        if (result >= 0 || errno != EINTR) {
+            return result;
+        }
+    }
+}
+
 std::string FolderOf(const std::string& path) {
     const auto slash = path.rfind('/');
     if (slash == std::string::npos) {
@@ -50,60 +69,6 @@ std::string ResolveTarget(const std::string& path) {
     return target;
 }
 
-int ReadDescriptor(int fd, std::string& out) {
-    struct stat info {};
-    if (::fstat(fd, &info) != 0) {
-        return errno;
-    }
-    if (S_ISDIR(info.st_mode)) {
-        return EISDIR;
-    }
-    std::string text;
-    text.reserve(static_cast<size_t>(std::clamp<int64_t>(info.st_size, 0, AtomicFile::kMaxBytes)));
-    std::array<char, 65536> block{};
-    for (;;) {
-        const ssize_t got = ::read(fd, block.data(), block.size());
-        if (got < 0 && errno == EINTR) {
-            continue;
-        }
-        if (got < 0) {
-            return errno;
-        }
-        if (got == 0) {
-            break;
-        }
-        if (static_cast<int64_t>(text.size()) + got > AtomicFile::kMaxBytes) {
-            return EFBIG;
-        }
-        text.append(block.data(), static_cast<size_t>(got));
-    }
-    out = std::move(text);
-    return 0;
-}
-
-int WriteAll(int fd, std::string_view text) {
-    while (!text.empty()) {
-        const ssize_t put = ::write(fd, text.data(), text.size());
-        if (put < 0 && errno == EINTR) {
-            continue;
-        }
-        if (put < 0) {
-            return errno;
-        }
-        text.remove_prefix(static_cast<size_t>(put));
-    }
-    return 0;
-}
-
-// Makes a rename in the folder durable; file systems that cannot do this
-// still keep the rename atomic, so a failure here is not an error.
-void SyncFolder(const std::string& folder) {
-    const UniqueFd handle(::open(folder.c_str(), O_RDONLY | O_DIRECTORY | O_CLOEXEC));
-    if (handle.Valid()) {
-        ::fsync(handle.Get());
-    }
-}
-
 bool SameInode(int fd, const std::string& path) {
     struct stat held {};
     struct stat current {};
@@ -122,27 +87,84 @@ std::string TimeTag() {
 
 }  // namespace
 
-AtomicFile::AtomicFile(std::string path, NewFileMode newMode)
-    : path_(std::move(path)), newMode_(newMode) {}
+AtomicFile::AtomicFile(std::string path, NewFileMode newMode, SystemCalls& calls)
+    : path_(std::move(path)), newMode_(newMode), calls_(calls) {}
 
 AtomicFile::~AtomicFile() {
     Unlock();
 }
 
+int AtomicFile::Open(const std::string& path, int flags, mode_t mode) const {
+    return Retrying([&] { return calls_.Open(path.c_str(), flags, mode); });
+}
+
+std::error_code AtomicFile::ReadAll(int fd, std::string& out) const {
+    struct stat info {};
+    if (::fstat(fd, &info) != 0) {
+        return LastError();
+    }
+    if (S_ISDIR(info.st_mode)) {
+        return ErrorOf(std::errc::is_a_directory);
+    }
+    std::string text;
+    text.reserve(static_cast<size_t>(std::clamp<int64_t>(info.st_size, 0, kMaxBytes)));
+    std::array<char, 65536> block{};
+    for (;;) {
+        const ssize_t got = Retrying([&] { return calls_.Read(fd, block.data(), block.size()); });
+        if (got < 0) {
+            return LastError();
+        }
+        if (got == 0) {
+            break;
+        }
+        if (static_cast<int64_t>(text.size()) + got > kMaxBytes) {
+            return ErrorOf(std::errc::file_too_large);
+        }
+        text.append(block.data(), static_cast<size_t>(got));
+    }
+    out = std::move(text);
+    return {};
+}
+
+std::error_code AtomicFile::WriteAll(int fd, std::string_view text) const {
+    while (!text.empty()) {
+        const ssize_t put = Retrying([&] { return calls_.Write(fd, text.data(), text.size()); });
+        if (put < 0) {
+            return LastError();
+        }
+        text.remove_prefix(static_cast<size_t>(put));
+    }
+    return {};
+}
+
+std::error_code AtomicFile::Sync(int fd) const {
+    return Retrying([&] { return calls_.Fsync(fd); }) != 0 ? LastError() : std::error_code();
+}
+
+// Makes a rename in the folder durable; file systems that cannot do this
+// still keep the rename atomic, so a failure here is not an error.
+void AtomicFile::SyncFolder(const std::string& folder) const {
+    const UniqueFd handle(Open(folder, O_RDONLY | O_DIRECTORY | O_CLOEXEC));
+    if (handle.Valid()) {
+        static_cast<void>(Sync(handle.Get()));
+    }
+}
+
 FileRead AtomicFile::Read() const {
     FileRead result;
     const std::string& path = Locked() ? lockedTarget_ : path_;
-    auto file = std::make_shared<UniqueFd>(::open(path.c_str(), O_RDONLY | O_CLOEXEC | O_NOCTTY));
+    auto file = std::make_shared<UniqueFd>(Open(path, O_RDONLY | O_CLOEXEC | O_NOCTTY));
     if (!file->Valid()) {
-        result.error = errno;
-        const bool missing = result.error == ENOENT || result.error == ENOTDIR;
+        result.error = LastError();
+        const bool missing = result.error == std::errc::no_such_file_or_directory ||
+                             result.error == std::errc::not_a_directory;
         result.status = missing ? ReadStatus::Missing : ReadStatus::Unreadable;
         return result;
     }
     struct stat info {};
     result.error =
-        ::fstat(file->Get(), &info) == 0 ? ReadDescriptor(file->Get(), result.text) : errno;
-    if (result.error != 0) {
+        ::fstat(file->Get(), &info) == 0 ? ReadAll(file->Get(), result.text) : LastError();
+    if (result.error) {
         result.status = ReadStatus::Unreadable;
         result.text.clear();
         return result;
@@ -156,8 +178,7 @@ FileStamp AtomicFile::Stamp() const {
     if (!Locked()) {
         return FileStamp::OfPath(path_);
     }
-    auto pin =
-        std::make_shared<UniqueFd>(::open(lockedTarget_.c_str(), O_RDONLY | O_CLOEXEC | O_NOCTTY));
+    auto pin = std::make_shared<UniqueFd>(Open(lockedTarget_, O_RDONLY | O_CLOEXEC | O_NOCTTY));
     struct stat info {};
     if (!pin->Valid() || ::fstat(pin->Get(), &info) != 0) {
         return FileStamp::OfPath(lockedTarget_);
@@ -165,31 +186,30 @@ FileStamp AtomicFile::Stamp() const {
     return FileStamp::OfStat(info, std::move(pin));
 }
 
-int AtomicFile::Lock() {
+std::error_code AtomicFile::Lock() {
     if (Locked()) {
-        return 0;
+        return {};
     }
     return LockTarget(ResolveTarget(path_));
 }
 
-int AtomicFile::LockTarget(const std::string& target) {
+std::error_code AtomicFile::LockTarget(const std::string& target) {
     const auto deadline = std::chrono::steady_clock::now() + std::chrono::milliseconds(kLockWaitMs);
     for (;;) {
         UniqueFd file;
-        const int error = OpenForLock(target, file);
-        if (error != 0) {
+        if (const std::error_code error = OpenForLock(target, file)) {
             return error;
         }
         int pauseMs = 1;
-        while (::flock(file.Get(), LOCK_EX | LOCK_NB) != 0) {
-            if (errno == EINTR) {
-                continue;
-            }
+        while (Retrying([&] { return calls_.Flock(file.Get(), LOCK_EX | LOCK_NB); }) != 0) {
             if (errno != EWOULDBLOCK) {
-                return errno;
+                const std::error_code error = LastError();
+                Abandon(file, target);
+                return error;
             }
             if (std::chrono::steady_clock::now() >= deadline) {
-                return ETIMEDOUT;
+                Abandon(file, target);
+                return ErrorOf(std::errc::timed_out);
             }
             std::this_thread::sleep_for(std::chrono::milliseconds(pauseMs));
             pauseMs = std::min(pauseMs * 2, 50);
@@ -197,67 +217,75 @@ int AtomicFile::LockTarget(const std::string& target) {
         if (SameInode(file.Get(), target)) {
             lock_ = std::move(file);
             lockedTarget_ = target;
-            return 0;
+            return {};
         }
     }
 }
 
-int AtomicFile::OpenForLock(const std::string& target, UniqueFd& fd) {
+// A file created empty only to be locked goes again when nothing was
+// written to it.
+void AtomicFile::Abandon(UniqueFd& file, const std::string& target) {
+    struct stat info {};
+    if (createdEmpty_ && ::fstat(file.Get(), &info) == 0 && info.st_size == 0 &&
+        SameInode(file.Get(), target)) {
+        ::unlink(target.c_str());
+    }
+    file.Reset();
+    createdEmpty_ = false;
+}
+
+std::error_code AtomicFile::OpenForLock(const std::string& target, UniqueFd& fd) {
     const mode_t mode = newMode_ == NewFileMode::OwnerOnly ? 0600 : 0666;
     for (;;) {
-        fd.Reset(::open(target.c_str(), O_RDONLY | O_CLOEXEC | O_NOCTTY));
+        fd.Reset(Open(target, O_RDONLY | O_CLOEXEC | O_NOCTTY));
         if (fd.Valid()) {
             createdEmpty_ = false;
             struct stat info {};
-            return ::fstat(fd.Get(), &info) != 0 ? errno : S_ISDIR(info.st_mode) ? EISDIR : 0;
+            if (::fstat(fd.Get(), &info) != 0) {
+                return LastError();
+            }
+            return S_ISDIR(info.st_mode) ? ErrorOf(std::errc::is_a_directory) : std::error_code();
         }
         if (errno != ENOENT) {
-            return errno;
+            return LastError();
         }
-        fd.Reset(::open(target.c_str(), O_RDONLY | O_CREAT | O_EXCL | O_CLOEXEC | O_NOCTTY, mode));
+        fd.Reset(Open(target, O_RDONLY | O_CREAT | O_EXCL | O_CLOEXEC | O_NOCTTY, mode));
         if (fd.Valid()) {
             createdEmpty_ = true;
-            return 0;
+            return {};
         }
         if (errno != EEXIST) {
-            return errno;
+            return LastError();
         }
     }
 }
 
 void AtomicFile::Unlock() {
-    if (!Locked()) {
-        return;
+    if (Locked()) {
+        Abandon(lock_, lockedTarget_);
+        lockedTarget_.clear();
     }
-    struct stat info {};
-    if (createdEmpty_ && ::fstat(lock_.Get(), &info) == 0 && info.st_size == 0 &&
-        SameInode(lock_.Get(), lockedTarget_)) {
-        ::unlink(lockedTarget_.c_str());
-    }
-    lock_.Reset();
-    lockedTarget_.clear();
-    createdEmpty_ = false;
 }
 
-int AtomicFile::Replace(std::string_view text) {
+std::error_code AtomicFile::Replace(std::string_view text) {
     const bool ownLock = !Locked();
-    int error = Lock();
-    if (error != 0) {
+    std::error_code error = Lock();
+    if (error) {
         return error;
     }
     UniqueFd temp;
     std::string tempPath;
     if (::access(lockedTarget_.c_str(), W_OK) != 0) {
-        error = errno;
+        error = LastError();
     } else {
         error = WriteTemporary(text, temp, tempPath);
     }
-    if (error == 0 && (::flock(temp.Get(), LOCK_EX | LOCK_NB) != 0 ||
-                       ::rename(tempPath.c_str(), lockedTarget_.c_str()) != 0)) {
-        error = errno;
+    if (!error && (Retrying([&] { return calls_.Flock(temp.Get(), LOCK_EX | LOCK_NB); }) != 0 ||
+                   calls_.Rename(tempPath.c_str(), lockedTarget_.c_str()) != 0)) {
+        error = LastError();
         ::unlink(tempPath.c_str());
     }
-    if (error == 0) {
+    if (!error) {
         SyncFolder(FolderOf(lockedTarget_));
         lock_ = std::move(temp);
         createdEmpty_ = false;
@@ -268,48 +296,51 @@ int AtomicFile::Replace(std::string_view text) {
     return error;
 }
 
-int AtomicFile::WriteTemporary(std::string_view text, UniqueFd& temp, std::string& tempPath) const {
+std::error_code AtomicFile::WriteTemporary(std::string_view text, UniqueFd& temp,
+                                           std::string& tempPath) const {
     tempPath = FolderOf(lockedTarget_) + "/." + NameOf(lockedTarget_) + ".cv-tmp";
     ::unlink(tempPath.c_str());
-    temp.Reset(::open(tempPath.c_str(), O_RDWR | O_CREAT | O_EXCL | O_NOFOLLOW | O_CLOEXEC, 0600));
+    temp.Reset(Open(tempPath, O_RDWR | O_CREAT | O_EXCL | O_NOFOLLOW | O_CLOEXEC, 0600));
     if (!temp.Valid()) {
-        return errno;
+        return LastError();
     }
     struct stat held {};
-    int error = ::fstat(lock_.Get(), &held) != 0 ? errno : 0;
-    if (error == 0 && ::fchmod(temp.Get(), held.st_mode & 07777) != 0) {
-        error = errno;
+    std::error_code error = ::fstat(lock_.Get(), &held) != 0 ? LastError() : std::error_code();
+    if (!error && ::fchmod(temp.Get(), held.st_mode & 07777) != 0) {
+        error = LastError();
     }
-    if (error == 0) {
+    if (!error) {
         error = WriteAll(temp.Get(), text);
     }
-    if (error == 0 && ::fsync(temp.Get()) != 0) {
-        error = errno;
+    if (!error) {
+        error = Sync(temp.Get());
     }
-    if (error != 0) {
+    if (error) {
         temp.Reset();
         ::unlink(tempPath.c_str());
     }
     return error;
 }
 
-int AtomicFile::SetAside(std::string& asidePath) {
+std::error_code AtomicFile::SetAside(std::string& asidePath) {
     const bool ownLock = !Locked();
-    int error = Lock();
-    if (error != 0) {
+    std::error_code error = Lock();
+    if (error) {
         return error;
     }
     const FileRead current = Read();
-    error = current.status == ReadStatus::Read ? 0 : current.error;
+    error = current.status == ReadStatus::Read ? std::error_code() : current.error;
     const std::string base = lockedTarget_ + ".damaged-" + TimeTag();
-    for (int attempt = 1; error == 0; ++attempt) {
+    for (int attempt = 1; !error; ++attempt) {
         const std::string candidate = attempt == 1 ? base : base + "-" + std::to_string(attempt);
         error = CopyTo(current.text, candidate);
-        if (error == 0) {
+        if (!error) {
             asidePath = candidate;
             break;
         }
-        error = error == EEXIST && attempt < 1000 ? 0 : error;
+        if (error == std::errc::file_exists && attempt < 1000) {
+            error.clear();
+        }
     }
     if (ownLock) {
         Unlock();
@@ -317,26 +348,26 @@ int AtomicFile::SetAside(std::string& asidePath) {
     return error;
 }
 
-int AtomicFile::CopyTo(const std::string& text, const std::string& asidePath) const {
-    const UniqueFd copy(::open(asidePath.c_str(), O_WRONLY | O_CREAT | O_EXCL | O_CLOEXEC, 0600));
+std::error_code AtomicFile::CopyTo(const std::string& text, const std::string& asidePath) const {
+    const UniqueFd copy(Open(asidePath, O_WRONLY | O_CREAT | O_EXCL | O_CLOEXEC, 0600));
     if (!copy.Valid()) {
-        return errno;
+        return LastError();
     }
-    int error = WriteAll(copy.Get(), text);
-    if (error == 0 && ::fsync(copy.Get()) != 0) {
-        error = errno;
+    std::error_code error = WriteAll(copy.Get(), text);
+    if (!error) {
+        error = Sync(copy.Get());
     }
-    if (error != 0) {
+    if (error) {
         ::unlink(asidePath.c_str());
     }
     return error;
 }
 
-int AtomicFile::MakeFolders(const std::string& folder) {
+std::error_code AtomicFile::MakeFolders(const std::string& folder) {
     for (size_t slash = folder.find('/', 1);; slash = folder.find('/', slash + 1)) {
         const std::string prefix = folder.substr(0, slash);
         if (!prefix.empty() && ::mkdir(prefix.c_str(), 0700) != 0 && errno != EEXIST) {
-            return errno;
+            return LastError();
         }
         if (slash == std::string::npos) {
             break;
@@ -344,9 +375,9 @@ int AtomicFile::MakeFolders(const std::string& folder) {
     }
     struct stat info {};
     if (::stat(folder.c_str(), &info) != 0) {
-        return errno;
+        return LastError();
     }
-    return S_ISDIR(info.st_mode) ? 0 : ENOTDIR;
+    return S_ISDIR(info.st_mode) ? std::error_code() : ErrorOf(std::errc::not_a_directory);
 }
 
 }  // namespace cv::posix

@@ -3,8 +3,10 @@
 #include <cstdint>
 #include <string>
 #include <string_view>
+#include <system_error>
 
 #include "platform/posix/FileStamp.h"
+#include "platform/posix/SystemCalls.h"
 #include "platform/posix/UniqueFd.h"
 
 namespace cv::posix {
@@ -24,8 +26,8 @@ enum class NewFileMode {
 struct FileRead {
     ReadStatus status = ReadStatus::Missing;
     std::string text;
-    FileStamp stamp;  // of the version read; missing unless status is Read
-    int error = 0;    // errno behind Unreadable
+    FileStamp stamp;        // of the version read; missing unless status is Read
+    std::error_code error;  // the system's reason for Unreadable
 };
 
 // One file that is only ever replaced whole, never torn, and whose
@@ -47,7 +49,11 @@ struct FileRead {
 // left by a crash is simply overwritten by the next writer. Locks are per
 // object: two objects of one process on the same file exclude each other too.
 //
-// Every result is an errno value, 0 for success; nothing throws.
+// Failures: every result is the system's error code (generic category), empty
+// for success; nothing throws. A failed Replace leaves the old file as it was
+// and no temporary file behind, and releases a lock it took. Interrupted
+// calls (EINTR) are repeated and short writes continued. All disk access goes
+// through the SystemCalls given, so tests can make any call fail.
 class AtomicFile {
   public:
     // Files larger than this are not read (Unreadable, EFBIG).
@@ -55,7 +61,8 @@ class AtomicFile {
     // How long Lock waits for another holder before giving up with ETIMEDOUT.
     static constexpr int kLockWaitMs = 10000;
 
-    explicit AtomicFile(std::string path, NewFileMode newMode = NewFileMode::OwnerOnly);
+    explicit AtomicFile(std::string path, NewFileMode newMode = NewFileMode::OwnerOnly,
+                        SystemCalls& calls = SystemCalls::Real());
     ~AtomicFile();
     AtomicFile(const AtomicFile&) = delete;
     AtomicFile& operator=(const AtomicFile&) = delete;
@@ -64,35 +71,43 @@ class AtomicFile {
 
     // The whole file. Needs no lock: writers only ever rename whole files in.
     // While this object holds the lock, reads the locked version.
-    FileRead Read() const;
+    [[nodiscard]] FileRead Read() const;
     // The current version's stamp, without reading (one stat). While this
     // object holds the lock: the locked version's stamp, which keeps that
     // version's inode pinned like a stamp from Read.
-    FileStamp Stamp() const;
+    [[nodiscard]] FileStamp Stamp() const;
 
-    int Lock();
+    [[nodiscard]] std::error_code Lock();
     void Unlock();
     bool Locked() const { return lock_.Valid(); }
 
     // Puts text in place atomically. Takes the lock for the call when not
     // held. Refuses (EACCES) a file the user has made read-only.
-    int Replace(std::string_view text);
+    [[nodiscard]] std::error_code Replace(std::string_view text);
     // Keeps a copy of the current file as "<path>.damaged-YYYYMMDD-HHMMSS"
     // (with "-2", "-3", ... when taken), so that a following Replace cannot
     // lose it; asidePath receives the copy's path.
-    int SetAside(std::string& asidePath);
+    [[nodiscard]] std::error_code SetAside(std::string& asidePath);
 
     // Creates folder and its missing parents with mode 0700.
-    static int MakeFolders(const std::string& folder);
+    [[nodiscard]] static std::error_code MakeFolders(const std::string& folder);
 
   private:
-    int LockTarget(const std::string& target);
-    int OpenForLock(const std::string& target, UniqueFd& fd);
-    int WriteTemporary(std::string_view text, UniqueFd& temp, std::string& tempPath) const;
-    int CopyTo(const std::string& text, const std::string& asidePath) const;
+    std::error_code LockTarget(const std::string& target);
+    std::error_code OpenForLock(const std::string& target, UniqueFd& fd);
+    std::error_code WriteTemporary(std::string_view text, UniqueFd& temp,
+                                   std::string& tempPath) const;
+    std::error_code CopyTo(const std::string& text, const std::string& asidePath) const;
+    void Abandon(UniqueFd& file, const std::string& target);
+    int Open(const std::string& path, int flags, mode_t mode = 0) const;
+    std::error_code ReadAll(int fd, std::string& out) const;
+    std::error_code WriteAll(int fd, std::string_view text) const;
+    std::error_code Sync(int fd) const;
+    void SyncFolder(const std::string& folder) const;
 
     std::string path_;
     NewFileMode newMode_;
+    SystemCalls& calls_;
     UniqueFd lock_;
     std::string lockedTarget_;
     bool createdEmpty_ = false;

@@ -26,7 +26,8 @@ std::string WithoutTrailingBlanks(std::string text) {
 
 }  // namespace
 
-FileProfiles::FileProfiles(std::string configFolder) : configFolder_(std::move(configFolder)) {}
+FileProfiles::FileProfiles(std::string configFolder, SystemCalls& calls)
+    : configFolder_(std::move(configFolder)), calls_(calls) {}
 
 FileProfiles::Profile* FileProfiles::Open(const std::string& fileName) {
     const std::string path = ProfilePath(CString(fileName), configFolder_);
@@ -40,7 +41,8 @@ FileProfiles::Profile* FileProfiles::Open(const std::string& fileName) {
     const bool settings = IsInConfigFolder(path, configFolder_);
     Profile& profile =
         profiles_
-            .try_emplace(path, path, settings ? NewFileMode::OwnerOnly : NewFileMode::UmaskDefault)
+            .try_emplace(path, path, settings ? NewFileMode::OwnerOnly : NewFileMode::UmaskDefault,
+                         calls_)
             .first->second;
     profile.inConfigFolder = settings;
     return &profile;
@@ -139,10 +141,10 @@ bool FileProfiles::EndBatch(const std::string& fileName) {
 }
 
 bool FileProfiles::Store(Profile& profile, const Edit* edit) {
-    if (profile.inConfigFolder && AtomicFile::MakeFolders(configFolder_) != 0) {
+    if (profile.inConfigFolder && AtomicFile::MakeFolders(configFolder_)) {
         return false;
     }
-    if (profile.file.Lock() != 0) {
+    if (profile.file.Lock()) {
         return false;
     }
     const bool stored = StoreLocked(profile, edit);
@@ -163,10 +165,10 @@ bool FileProfiles::StoreLocked(Profile& profile, const Edit* edit) {
         return true;
     }
     std::string aside;
-    if (profile.foreign && profile.file.SetAside(aside) != 0) {
+    if (profile.foreign && profile.file.SetAside(aside)) {
         return false;
     }
-    if (profile.file.Replace(profile.document.Serialise()) != 0) {
+    if (profile.file.Replace(profile.document.Serialise())) {
         return false;
     }
     // The document now matches the file; a read under the lock gives the

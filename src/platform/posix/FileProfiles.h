@@ -48,7 +48,9 @@ namespace cv::posix {
 // Window thread only.
 class FileProfiles : public platform::ProfileApi {
   public:
-    explicit FileProfiles(std::string configFolder = ConfigFolder());
+    // Files are reached through calls (tests make them fail).
+    explicit FileProfiles(std::string configFolder = ConfigFolder(),
+                          SystemCalls& calls = SystemCalls::Real());
 
     std::string GetPrivateProfileString(const std::string& section, const std::string& key,
                                         const std::string& defaultValue, int32_t bufferSize,
@@ -69,7 +71,8 @@ class FileProfiles : public platform::ProfileApi {
     };
 
     struct Profile {
-        Profile(std::string path, NewFileMode mode) : file(std::move(path), mode) {}
+        Profile(std::string path, NewFileMode mode, SystemCalls& calls)
+            : file(std::move(path), mode, calls) {}
 
         AtomicFile file;
         bool inConfigFolder = false;
@@ -93,6 +96,7 @@ class FileProfiles : public platform::ProfileApi {
     static bool Apply(IniDocument& document, const Edit& edit);
 
     std::string configFolder_;
+    SystemCalls& calls_;
     // By resolved path.
     std::unordered_map<std::string, Profile> profiles_;
 };

@@ -12,10 +12,12 @@ namespace {
 
 using namespace platform;
 
-int32_t RegistryCode(int errorNumber) {
-    switch (errorNumber) {
-        case 0:
-            return kErrorSuccess;
+// The registry's code for a file error (all of the generic category).
+int32_t RegistryCode(const std::error_code& error) {
+    if (!error) {
+        return kErrorSuccess;
+    }
+    switch (error.value()) {
         case EACCES:
         case EPERM:
         case EROFS:
@@ -87,28 +89,28 @@ void FileRegistry::Refresh(Root& root) {
 }
 
 int32_t FileRegistry::Change(Root& root, const std::function<bool(RegistryKey&)>& change) {
-    int error = AtomicFile::MakeFolders(folder_);
+    std::error_code error = AtomicFile::MakeFolders(folder_);
     AtomicFile file(root.path);
-    if (error == 0) {
+    if (!error) {
         error = file.Lock();
     }
     FileRead read;
-    if (error == 0) {
+    if (!error) {
         read = file.Read();
-        error = read.status == ReadStatus::Unreadable ? read.error : 0;
+        error = read.status == ReadStatus::Unreadable ? read.error : std::error_code();
     }
-    if (error != 0) {
+    if (error) {
         return RegistryCode(error);
     }
     bool damaged = false;
     RegistryKey tree = RegistryFile::Parse(read.text, damaged);
     if (change(tree)) {
         std::string aside;
-        error = damaged ? file.SetAside(aside) : 0;
-        if (error == 0) {
+        error = damaged ? file.SetAside(aside) : std::error_code();
+        if (!error) {
             error = file.Replace(RegistryFile::Write(tree, root.name));
         }
-        if (error != 0) {
+        if (error) {
             return RegistryCode(error);
         }
         read.stamp = file.Stamp();

@@ -8,6 +8,7 @@
 #include <string>
 
 #include "platform/posix/ProfilePath.h"
+#include "support/FaultyCalls.h"
 #include "support/TempFolder.h"
 #include "support/TestFiles.h"
 
@@ -155,6 +156,21 @@ TEST_F(FileProfilesTest, BatchesStoreOnceAtTheEndAndKeepOthersWrites) {
 
     EXPECT_EQ(Slurp(file_), "[S]\r\nc=3\r\nd=4\r\na=1\r\n");
     EXPECT_FALSE(profiles_.EndBatch(file_));
+}
+
+TEST_F(FileProfilesTest, AWriteTheDiskRefusesFailsAndKeepsTheFile) {
+    Spill(file_, "[S]\r\na=1\r\n");
+    test::FaultyCalls calls;
+    FileProfiles profiles(config_, calls);
+    calls.Fail(test::FaultyCalls::Call::Write, ENOSPC);
+    EXPECT_FALSE(profiles.WritePrivateProfileString("S", "a"s, "2"s, file_));
+    EXPECT_EQ(Read(profiles, file_, "a"), "1");
+    profiles.BeginBatch(file_);
+    EXPECT_TRUE(profiles.WritePrivateProfileString("S", "b"s, "3"s, file_));
+    calls.Fail(test::FaultyCalls::Call::Rename, EIO);
+    EXPECT_FALSE(profiles.EndBatch(file_));
+    EXPECT_EQ(Read(profiles, file_, "b"), "none");
+    EXPECT_EQ(Slurp(file_), "[S]\r\na=1\r\n");
 }
 
 TEST_F(FileProfilesTest, DamagedFilesAreNeverOverwritten) {
