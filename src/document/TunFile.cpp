@@ -64,9 +64,12 @@ bool TunFile::WriteToDisk(const std::string& sPath) {
         mcSpecifics->WriteToDisk(*this);
     }
     mcLoops->WriteToDisk(*this);
-    static_cast<void>(cSharedBatch.End());
-    if (!cBatch.End()) {
+    const bool bSharedStored = cSharedBatch.End();
+    const bool bStored = cBatch.End();
+    if (!bStored) {
         mcIniFile.SetFileName(std::move(sFormerPath));
+    }
+    if (!bStored || !bSharedStored) {
         ShowError("Error: TunFile.WriteToDisk");
         return false;
     }

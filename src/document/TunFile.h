@@ -42,9 +42,11 @@ class TunFile {
     // a file name, or an empty path, is refused with a message.
     bool ReadFromDisk(int32_t lTuner, const std::string& sPath);
     // Writes the document to sPath as one replacement of the file (and one
-    // of the shared settings file): other programs see all of the save or
-    // none of it. False, with a message and the old file name kept, when the
-    // path is empty or the file could not be stored.
+    // of the shared settings file, which holds the colours and widths of PV,
+    // CO and SP): other programs see all of each file's part or none of it.
+    // False with a message when the path is empty or either part could not
+    // be stored whole (a text the file refuses fails its part); the document
+    // keeps its old file name unless the tuning file itself was stored.
     [[nodiscard]] bool WriteToDisk(const std::string& sPath);
     // Upgrades keys that files of version 12.07.99 and before held in an
     // older form.

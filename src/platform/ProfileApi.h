@@ -39,7 +39,9 @@ class ProfileApi {
     // memory: every read through this object sees them at once, other programs
     // see them only when the outermost EndBatch stores them all with one
     // replacement of the file. Batches nest. EndBatch returns false when the
-    // store failed; the batch's writes are then lost and the file is unchanged.
+    // store failed or a write of the batch was refused (a batch is stored
+    // whole or not at all); the batch's writes are then lost and the file is
+    // unchanged.
     virtual void BeginBatch(const std::string& fileName) = 0;
     virtual bool EndBatch(const std::string& fileName) = 0;
 };

@@ -76,8 +76,10 @@ class IniFile {
         Batch(const Batch&) = delete;
         Batch& operator=(const Batch&) = delete;
 
-        // Stores the writes now; true when they reached the file. Only the
-        // first call stores; later calls return false.
+        // Stores the writes now; true when they all reached the file. A write
+        // the file refused (a value with a line break) fails the whole batch,
+        // which then stores nothing. Only the first call stores; later calls
+        // return false.
         [[nodiscard]] bool End();
 
       private:

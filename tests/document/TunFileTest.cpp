@@ -86,6 +86,39 @@ TEST_F(TunFileDocument, RefusedReadsAndFailedSavesKeepTheDocumentsFile) {
     EXPECT_FALSE(std::filesystem::exists(blocked));
 }
 
+// A save stores every part or says it did not: the shared file holds the
+// colours of PV, CO and SP, and a text the file refuses fails its part.
+TEST_F(TunFileDocument, ASaveThatLostAPartReportsIt) {
+    struct Row {
+        const char* what;
+        bool sharedBlocked;
+        const char* description;
+        bool tunStored;
+    };
+    for (const Row& row :
+         {Row{"shared file", true, "Loop", true}, Row{"refused text", false, "two\r\nlines", false},
+          Row{"whole", false, "Loop", true}}) {
+        SCOPED_TRACE(row.what);
+        test::TempFolder folder;
+        const std::string shared = tp.folder.File("Corvalen.ini");
+        std::filesystem::remove_all(shared);
+        if (row.sharedBlocked) {
+            std::filesystem::create_directory(shared);
+        }
+        TunFile doc(tp.platform);
+        doc.SetDefaults(9);
+        doc.CurrentLoop()->SetDescription(row.description);
+        tp.dialogs.Clear();
+        const bool saved = doc.WriteToDisk(folder.File("plant.tun"));
+        const bool whole = !row.sharedBlocked && row.tunStored;
+        EXPECT_EQ(saved, whole);
+        EXPECT_EQ(tp.dialogs.Messages().size(), whole ? 0u : 1u);
+        EXPECT_EQ(std::filesystem::exists(folder.File("plant.tun")), row.tunStored);
+        EXPECT_EQ(doc.TunFilePath(),
+                  row.tunStored ? folder.File("plant.tun") : programFolder.File("LoopTag.tun"));
+    }
+}
+
 TEST(TunFile, ConvertFileFormatRewritesOldWordBooleans) {
     const struct {
         const char *versionLine, *storedAuto, *expectedAuto, *expectedManual;

@@ -102,13 +102,14 @@ bool FileProfiles::WritePrivateProfileString(const std::string& section,
                                              const std::optional<std::string>& value,
                                              const std::string& fileName) {
     Edit edit{CString(section), CString(key), key ? CString(value) : std::nullopt};
+    Profile* profile = Open(fileName);
+    if (profile == nullptr) {
+        return false;
+    }
     if (!IniDocument::IsSectionName(edit.section) ||
         (edit.key && !IniDocument::IsKeyName(*edit.key)) ||
         (edit.value && !IniDocument::IsValueText(*edit.value))) {
-        return false;
-    }
-    Profile* profile = Open(fileName);
-    if (profile == nullptr) {
+        profile->refused = profile->refused || profile->batchDepth > 0;
         return false;
     }
     if (profile->batchDepth == 0) {
@@ -134,9 +135,12 @@ bool FileProfiles::EndBatch(const std::string& fileName) {
     if (--profile->batchDepth > 0) {
         return true;
     }
-    const bool stored = profile->pending.empty() || Store(*profile, nullptr);
+    // A batch whose writes were not all taken stores none of them.
+    const bool stored = !profile->refused && (profile->pending.empty() || Store(*profile, nullptr));
+    profile->loaded = profile->loaded && !profile->refused;
     profile->pending.clear();
     profile->dirty = false;
+    profile->refused = false;
     return stored;
 }
 

@@ -86,6 +86,8 @@ class FileProfiles : public platform::ProfileApi {
         std::vector<Edit> pending;
         // Whether pending changed the document.
         bool dirty = false;
+        // Whether the batch refused a write.
+        bool refused = false;
     };
 
     Profile* Open(const std::string& fileName);

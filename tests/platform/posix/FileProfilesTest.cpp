@@ -156,6 +156,14 @@ TEST_F(FileProfilesTest, BatchesStoreOnceAtTheEndAndKeepOthersWrites) {
 
     EXPECT_EQ(Slurp(file_), "[S]\r\nc=3\r\nd=4\r\na=1\r\n");
     EXPECT_FALSE(profiles_.EndBatch(file_));
+
+    // A batch with a write the file refuses stores none of its writes.
+    profiles_.BeginBatch(file_);
+    EXPECT_TRUE(profiles_.WritePrivateProfileString("S", "e"s, "5"s, file_));
+    EXPECT_FALSE(profiles_.WritePrivateProfileString("S", "f"s, "two\nlines"s, file_));
+    EXPECT_FALSE(profiles_.EndBatch(file_));
+    EXPECT_EQ(Read(profiles_, file_, "e"), "none");
+    EXPECT_EQ(Slurp(file_), "[S]\r\nc=3\r\nd=4\r\na=1\r\n");
 }
 
 TEST_F(FileProfilesTest, AWriteTheDiskRefusesFailsAndKeepsTheFile) {
