@@ -82,6 +82,7 @@ class ReparsingProfiles : public cv::platform::ProfileApi {
                                    const std::optional<std::string>&, const std::string&) override {
         return false;
     }
+    bool FileReadable(const std::string&) override { return true; }
     void BeginBatch(const std::string&) override {}
     bool EndBatch(const std::string&) override { return false; }
 };

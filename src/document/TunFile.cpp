@@ -35,6 +35,13 @@ bool TunFile::ReadFromDisk(int32_t lTuner, const std::string& sPath) {
         ShowError("Error: TunFile.ReadFromDisk(2)");
         return false;
     }
+    // A mistyped or unreadable path would otherwise read as a document of
+    // defaults, and the next save would create a file under that name.
+    if (!mPlatform.profiles.FileReadable(sPath)) {
+        ShowError("Error: TunFile.ReadFromDisk(3)\r\n\r\nThe tuning file \"" + sPath +
+                  "\" is missing or cannot be read.");
+        return false;
+    }
     mcTunerType.SetTuner(lTuner);
     mcIniFile.SetFileName(sPath);
     ConvertFileFormat();

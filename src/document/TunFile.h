@@ -39,7 +39,9 @@ class TunFile {
     // names the default file.
     void SetDefaults(int32_t lTuner);
     // Reads a tuning file into a fresh document; a document that already has
-    // a file name, or an empty path, is refused with a message.
+    // a file name, an empty path, and a file that is missing or cannot be
+    // read are refused with a message, leaving the document as it was. A
+    // file that merely lacks keys reads their defaults.
     bool ReadFromDisk(int32_t lTuner, const std::string& sPath);
     // Writes the document to sPath as one replacement of the file (and one
     // of the shared settings file, which holds the colours and widths of PV,

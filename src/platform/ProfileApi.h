@@ -35,6 +35,11 @@ class ProfileApi {
                                            const std::optional<std::string>& value,
                                            const std::string& fileName) = 0;
 
+    // Whether fileName names a file that can be read: false when it is
+    // missing, a folder, or cannot be read (no permission, an I/O error). An
+    // empty file can be read.
+    virtual bool FileReadable(const std::string& fileName) = 0;
+
     // From BeginBatch to its matching EndBatch, writes to fileName are held in
     // memory: every read through this object sees them at once, other programs
     // see them only when the outermost EndBatch stores them all with one

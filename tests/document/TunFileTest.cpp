@@ -74,13 +74,28 @@ TEST_F(TunFileDocument, RefusedReadsAndFailedSavesKeepTheDocumentsFile) {
     EXPECT_FALSE(document.ReadFromDisk(9, ""));
     EXPECT_EQ(tp.dialogs.Last().text, "Error: TunFile.ReadFromDisk(2)");
     EXPECT_EQ(document.TunFilePath(), "");
+    // A file that is not there, or is no file, leaves the document untouched.
+    for (const std::string& path : {dataFolder.File("mistyped.tun"), dataFolder.Path()}) {
+        EXPECT_FALSE(document.ReadFromDisk(7, path));
+        EXPECT_EQ(tp.dialogs.Last().text,
+                  "Error: TunFile.ReadFromDisk(3)\r\n\r\nThe tuning file \"" + path +
+                      "\" is missing or cannot be read.");
+        EXPECT_EQ(std::tuple(document.TunFilePath(), document.TunerType(), document.IsValid()),
+                  std::tuple("", 0, false));
+    }
+    // One that merely lacks keys reads their defaults.
+    std::ofstream(dataFolder.File("empty.tun")) << "";
+    TunFile empty(tp.platform);
+    EXPECT_TRUE(empty.ReadFromDisk(9, dataFolder.File("empty.tun")));
+    EXPECT_EQ(empty.Archives().Count(), 3);
+    tp.dialogs.Clear();
 
     document.SetDefaults(9);
     EXPECT_FALSE(document.WriteToDisk(""));
     EXPECT_EQ(tp.dialogs.Last().text, "Error: TunFile.WriteToDisk");
     const std::string blocked = dataFolder.File("no-such-folder/plant.tun");
     EXPECT_FALSE(document.WriteToDisk(blocked));
-    EXPECT_EQ(tp.dialogs.Messages().size(), 3u);
+    EXPECT_EQ(tp.dialogs.Messages().size(), 2u);
     EXPECT_EQ(tp.dialogs.Last().text, "Error: TunFile.WriteToDisk");
     EXPECT_EQ(document.TunFilePath(), programFolder.File("LoopTag.tun"));
     EXPECT_FALSE(std::filesystem::exists(blocked));

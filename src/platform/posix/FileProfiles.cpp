@@ -121,6 +121,15 @@ bool FileProfiles::WritePrivateProfileString(const std::string& section,
     return true;
 }
 
+bool FileProfiles::FileReadable(const std::string& fileName) {
+    Profile* profile = Open(fileName);
+    if (profile == nullptr) {
+        return false;
+    }
+    Load(*profile);
+    return profile->status == ReadStatus::Read;
+}
+
 void FileProfiles::BeginBatch(const std::string& fileName) {
     if (Profile* profile = Open(fileName)) {
         ++profile->batchDepth;

@@ -59,6 +59,7 @@ class FileProfiles : public platform::ProfileApi {
                                    const std::optional<std::string>& key,
                                    const std::optional<std::string>& value,
                                    const std::string& fileName) override;
+    bool FileReadable(const std::string& fileName) override;
     void BeginBatch(const std::string& fileName) override;
     bool EndBatch(const std::string& fileName) override;
 
