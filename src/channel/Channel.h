@@ -133,6 +133,9 @@ class Channel {
     void SetExpectANumber(bool bExpect) { mbExpectANumber = bExpect; }
     void SetDisplayVarType(int16_t iVarType) { miDisplayVarType = iVarType; }
     bool IsOnline() const { return miState == OnlineState::Online; }
+    // The first step of going online: the channel waits for its first value
+    // (state GoingOnline); only then does a good value bring it online.
+    void MarkGoingOnline() { miState = OnlineState::GoingOnline; }
     int32_t Online(bool bTimedOut);
     void GoOffline();
     // Returns the stored error text and clears it.

@@ -181,6 +181,7 @@ TEST_F(TunFileDocument, CurrentChannelsFollowTheCurrentLoopAndModeNeedsItsChanne
 
     Channel* mode = document.Specifics().Item(SpecificType::Mode);
     mode->SetExpectANumber(false);
+    mode->MarkGoingOnline();
     mode->OpcSetRawValue(Variant::Str("AUTO\r\n"), 0xC0, 0, false);
     EXPECT_EQ(document.ModeValue(), "Automatic");
     mode->OpcSetRawValue(Variant::Str("CAS"), 0xC0, 0, false);
