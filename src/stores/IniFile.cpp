@@ -25,6 +25,11 @@ unsigned int LetterNibble(char cLetter) {
     return 0;
 }
 
+// The blanks a read strips from either end of a value.
+bool IsBlank(char cChar) {
+    return cChar == ' ' || cChar == '\t' || cChar == '\r' || cChar == '\v' || cChar == '\f';
+}
+
 }  // namespace
 
 IniFile::IniFile(platform::ProfileApi& cProfiles) : mcProfiles(cProfiles) {}
@@ -120,6 +125,15 @@ std::string IniFile::ReadString(const std::string& sSection, const std::string& 
 void IniFile::WriteString(const std::string& sSection, const std::string& sItem,
                           const std::string& sValue, bool bEncloseInQuotes) {
     WriteEntry(sSection, sItem, bEncloseInQuotes ? "'" + sValue + "'" : sValue);
+}
+
+void IniFile::WriteText(const std::string& sSection, const std::string& sItem,
+                        const std::string& sValue) {
+    const bool bQuoted = sValue.size() >= 2 && sValue.front() == sValue.back() &&
+                         (sValue.front() == '\'' || sValue.front() == '"');
+    const bool bNeedsQuotes =
+        !sValue.empty() && (IsBlank(sValue.front()) || IsBlank(sValue.back()) || bQuoted);
+    WriteString(sSection, sItem, sValue, bNeedsQuotes);
 }
 
 bool IniFile::ReadBoolean(const std::string& sSection, const std::string& sItem,

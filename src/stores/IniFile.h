@@ -60,6 +60,12 @@ class IniFile {
                            const std::string& sDefault) const;
     void WriteString(const std::string& sSection, const std::string& sItem,
                      const std::string& sValue, bool bEncloseInQuotes = false);
+    // Writes a text so that ReadString gives it back whole: one a read would
+    // strip (blanks at either end, one pair of enclosing quotes) goes in
+    // single quotes, which the read takes off again; any other text is
+    // stored as it is.
+    void WriteText(const std::string& sSection, const std::string& sItem,
+                   const std::string& sValue);
     bool ReadBoolean(const std::string& sSection, const std::string& sItem, bool bDefault) const;
     void WriteBoolean(const std::string& sSection, const std::string& sItem, bool bValue);
 
