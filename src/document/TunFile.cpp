@@ -11,7 +11,7 @@ TunFile::TunFile(Platform& platform)
       mcLoops(std::make_unique<LoopCollection>(platform)),
       mcIniFile(platform.profiles),
       mcTunerType(platform),
-      mcGeneral(platform) {}
+      mcGeneral(std::make_unique<TunFileGeneral>(platform)) {}
 
 TunFile::~TunFile() = default;
 
@@ -45,7 +45,7 @@ bool TunFile::ReadFromDisk(int32_t lTuner, const std::string& sPath) {
     mcTunerType.SetTuner(lTuner);
     mcIniFile.SetFileName(sPath);
     ConvertFileFormat();
-    mcGeneral.ReadFromDisk(mcIniFile);
+    mcGeneral->ReadFromDisk(mcIniFile);
     mcArchives->ReadFromDisk(*this);
     mcSpecifics->ReadFromDisk(*this);
     if (mcTunerType.HasFaceplate()) {
@@ -65,7 +65,7 @@ bool TunFile::WriteToDisk(const std::string& sPath) {
     IniFile cShared = CorvalentIni(mPlatform);
     IniFile::Batch cSharedBatch(cShared);
     IniFile::Batch cBatch(mcIniFile);
-    mcGeneral.WriteToDisk(mcIniFile, mcTunerType);
+    mcGeneral->WriteToDisk(mcIniFile, mcTunerType);
     mcArchives->WriteToDisk(mcIniFile, mcTunerType);
     if (mcTunerType.HasFaceplate()) {
         mcSpecifics->WriteToDisk(*this);
@@ -86,6 +86,12 @@ bool TunFile::WriteToDisk(const std::string& sPath) {
 void TunFile::SetArchives(std::unique_ptr<ArchiveChannels> cArchives) {
     if (cArchives != nullptr) {
         mcArchives = std::move(cArchives);
+    }
+}
+
+void TunFile::SetGeneral(std::unique_ptr<TunFileGeneral> cGeneral) {
+    if (cGeneral != nullptr) {
+        mcGeneral = std::move(cGeneral);
     }
 }
 

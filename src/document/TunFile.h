@@ -81,8 +81,10 @@ class TunFile {
     cv::TunerType& TunerTypeObj() { return mcTunerType; }
     const cv::TunerType& TunerTypeObj() const { return mcTunerType; }
 
-    TunFileGeneral& General() { return mcGeneral; }
-    const TunFileGeneral& General() const { return mcGeneral; }
+    TunFileGeneral& General() { return *mcGeneral; }
+    const TunFileGeneral& General() const { return *mcGeneral; }
+    // Null settings are ignored: the document always has them.
+    void SetGeneral(std::unique_ptr<TunFileGeneral> cGeneral);
     // Created empty; filled by the callers through its own operations.
     ModeMapClass& ModeMap() { return mcModeMap; }
     const ModeMapClass& ModeMap() const { return mcModeMap; }
@@ -117,7 +119,7 @@ class TunFile {
     std::unique_ptr<LoopCollection> mcLoops;
     IniFile mcIniFile;
     cv::TunerType mcTunerType;
-    TunFileGeneral mcGeneral;
+    std::unique_ptr<TunFileGeneral> mcGeneral;
     ModeMapClass mcModeMap;
 };
 

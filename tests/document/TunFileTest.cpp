@@ -190,7 +190,7 @@ TEST_F(TunFileDocument, CurrentChannelsFollowTheCurrentLoopAndModeNeedsItsChanne
     EXPECT_EQ(document.ModeValue(), "Unknown");
 }
 
-TEST_F(TunFileDocument, ReplacedCollectionsAreKeptAndNullIsIgnored) {
+TEST_F(TunFileDocument, ReplacedCollectionsAndSettingsAreKeptAndNullIsIgnored) {
     document.SetDefaults(9);
     auto archives = std::make_unique<ArchiveChannels>(tp.platform);
     ArchiveChannels* raw = archives.get();
@@ -201,6 +201,13 @@ TEST_F(TunFileDocument, ReplacedCollectionsAreKeptAndNullIsIgnored) {
     document.SetLoops(std::make_unique<LoopCollection>(tp.platform));
     document.SetLoops(nullptr);
     EXPECT_EQ(document.FaceplateLoop(), nullptr);
+    auto general = std::make_unique<TunFileGeneral>(tp.platform);
+    general->SetSIinSec(5);
+    TunFileGeneral* settings = general.get();
+    document.SetGeneral(std::move(general));
+    document.SetGeneral(nullptr);
+    EXPECT_EQ(std::tuple(&document.General(), document.General().SIinMSec()),
+              std::tuple(settings, 5000));
 }
 
 }  // namespace
