@@ -60,6 +60,7 @@ class frmOpcTestClient : public QWidget {
                           bool bIsMax, double dOtherLimit);
     bool CheckMinMax(double dMin, double dMax, const std::string& sSpanName);
     bool ValidateSI();
+    bool FitsRemembered(const std::string& sText);
     std::string RangeText(double dValue) const;
 
     // The remembered values (frmOpcTestClient_settings.cpp).

@@ -1,6 +1,7 @@
 #include "stores/IniFile.h"
 
 #include <algorithm>
+#include <limits>
 
 #include "stores/InvariantNumber.h"
 
@@ -66,11 +67,24 @@ std::string IniFile::Stored(const std::string& sText) const {
 }
 
 std::string IniFile::ReadEntry(const std::string& sSection, const std::string& sItem,
-                               const std::string& sDefault) const {
+                               const std::string& sDefault, int32_t lBufferSize) const {
     std::string value = mcProfiles.GetPrivateProfileString(
-        Stored(sSection), Stored(sItem), Stored(sDefault), kBufferSize, msFileName);
+        Stored(sSection), Stored(sItem), Stored(sDefault), lBufferSize, msFileName);
     value.resize(std::min(value.size(), value.find('\0')));
     return mbEncryptedFile ? Decrypt(value) : value;
+}
+
+// Whether sValue is what a read gives of a longer stored value: its first
+// bytes, cut by the read buffer.
+bool IniFile::IsCutOfStored(const std::string& sSection, const std::string& sItem,
+                            const std::string& sValue) const {
+    const auto lReadLimit =
+        static_cast<size_t>(mbEncryptedFile ? (kBufferSize - 1) / 2 : kBufferSize - 1);
+    if (sValue.size() != lReadLimit) {
+        return false;
+    }
+    const std::string sWhole = ReadEntry(sSection, sItem, "", std::numeric_limits<int32_t>::max());
+    return sWhole.size() > sValue.size() && sWhole.compare(0, sValue.size(), sValue) == 0;
 }
 
 void IniFile::WriteEntry(const std::string& sSection, const std::optional<std::string>& sItem,
@@ -124,6 +138,9 @@ std::string IniFile::ReadString(const std::string& sSection, const std::string& 
 
 void IniFile::WriteString(const std::string& sSection, const std::string& sItem,
                           const std::string& sValue, bool bEncloseInQuotes) {
+    if (IsCutOfStored(sSection, sItem, sValue)) {
+        return;
+    }
     WriteEntry(sSection, sItem, bEncloseInQuotes ? "'" + sValue + "'" : sValue);
 }
 

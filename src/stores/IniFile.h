@@ -21,7 +21,9 @@ namespace cv {
 // single quotes so that blanks around it survive the read.
 //
 // Reads see at most 254 bytes of a value (the 255-byte buffer of the profile
-// functions); with EncryptedFile that is 127 bytes of plain text. A stored
+// functions); with EncryptedFile that is 127 bytes of plain text. Writing
+// back what a read gave of a longer value leaves that value whole, so a
+// value is never cut by being read and saved again. A stored
 // number beyond the 32-bit range reads as the nearest end of that range
 // before any clamping.
 //
@@ -96,7 +98,9 @@ class IniFile {
 
   private:
     std::string ReadEntry(const std::string& sSection, const std::string& sItem,
-                          const std::string& sDefault) const;
+                          const std::string& sDefault, int32_t lBufferSize = kBufferSize) const;
+    bool IsCutOfStored(const std::string& sSection, const std::string& sItem,
+                       const std::string& sValue) const;
     void WriteEntry(const std::string& sSection, const std::optional<std::string>& sItem,
                     const std::optional<std::string>& sValue);
     std::string Stored(const std::string& sText) const;
