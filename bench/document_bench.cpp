@@ -5,11 +5,11 @@
 // change one description each time, so every save really replaces the file
 // (one batch: one atomic replacement, fsync included).
 
-#include <benchmark/benchmark.h>
-
 #include <cstdlib>
 #include <memory>
 #include <string>
+
+#include <benchmark/benchmark.h>
 
 #include "document/TunFile.h"
 #include "support/TestPlatform.h"

@@ -4,12 +4,12 @@
 // checks its change stamp. Writes are measured one replacement per key and
 // as one batch for the whole document.
 
-#include <benchmark/benchmark.h>
-
 #include <fstream>
 #include <sstream>
 #include <string>
 #include <vector>
+
+#include <benchmark/benchmark.h>
 
 #include "platform/posix/FileProfiles.h"
 #include "platform/posix/IniDocument.h"

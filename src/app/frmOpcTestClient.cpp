@@ -1,8 +1,6 @@
 #include "app/frmOpcTestClient.h"
-#include "platform/Platform.h"
-#include "ui/widgets/HelpTopics.h"
-#include "util/FloatText.h"
-#include "util/ProgramRoutines.h"
+
+#include <array>
 
 #include <QCheckBox>
 #include <QGridLayout>
@@ -12,7 +10,11 @@
 #include <QLineEdit>
 #include <QPushButton>
 #include <QVBoxLayout>
-#include <array>
+
+#include "platform/Platform.h"
+#include "ui/widgets/HelpTopics.h"
+#include "util/FloatText.h"
+#include "util/ProgramRoutines.h"
 
 namespace cv {
 

@@ -1,9 +1,10 @@
 #pragma once
 
-#include <QPointer>
-#include <QWidget>
 #include <deque>
 #include <string>
+
+#include <QPointer>
+#include <QWidget>
 
 #include "channel/Channel.h"
 #include "document/TunFile.h"

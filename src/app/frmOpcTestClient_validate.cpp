@@ -1,8 +1,9 @@
+#include <cmath>
+
 #include <QCheckBox>
 #include <QCloseEvent>
 #include <QFocusEvent>
 #include <QLineEdit>
-#include <cmath>
 
 #include "app/frmOpcTestClient.h"
 #include "platform/Platform.h"

@@ -6,10 +6,11 @@
 // --quit-when-shown  ends the program as soon as the main window has been
 //                    drawn for the first time (used to measure start-up).
 
-#include <QApplication>
 #include <cstdio>
 #include <cstdlib>
 #include <string_view>
+
+#include <QApplication>
 
 #include "app/frmOpcTestClient.h"
 #include "platform/Platform.h"

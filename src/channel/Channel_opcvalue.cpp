@@ -1,4 +1,5 @@
 #include "channel/Channel.h"
+
 #include "platform/Platform.h"
 #include "util/ProgramRoutines.h"
 

@@ -1,7 +1,8 @@
 #include "document/TunFileGeneral.h"
-#include "platform/Platform.h"
 
 #include <cmath>
+
+#include "platform/Platform.h"
 
 namespace cv {
 

@@ -1,4 +1,5 @@
 #include "document/TunFile.h"
+
 #include "platform/Platform.h"
 #include "platform/Variant.h"
 

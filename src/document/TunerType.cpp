@@ -1,7 +1,8 @@
 #include "document/TunerType.h"
-#include "platform/Platform.h"
 
 #include <array>
+
+#include "platform/Platform.h"
 
 namespace cv {
 

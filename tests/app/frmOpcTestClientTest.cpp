@@ -1,12 +1,13 @@
+#include <filesystem>
+#include <fstream>
+#include <memory>
+
 #include <QCheckBox>
 #include <QLabel>
 #include <QLineEdit>
 #include <QPushButton>
 #include <QWindow>
 #include <QtTest>
-#include <filesystem>
-#include <fstream>
-#include <memory>
 
 #include "app/frmOpcTestClient.h"
 #include "stores/RegClass.h"

@@ -1,10 +1,10 @@
-#include <gtest/gtest.h>
-
 #include <initializer_list>
 #include <memory>
 #include <sstream>
 #include <string>
 #include <tuple>
+
+#include <gtest/gtest.h>
 
 #include "channel/Channel.h"
 #include "document/TunFile.h"

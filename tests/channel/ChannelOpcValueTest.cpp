@@ -1,8 +1,8 @@
-#include <gtest/gtest.h>
-
 #include <chrono>
 #include <memory>
 #include <tuple>
+
+#include <gtest/gtest.h>
 
 #include "channel/Channel.h"
 #include "platform/OleDate.h"

@@ -1,7 +1,7 @@
-#include <gtest/gtest.h>
-
 #include <cmath>
 #include <tuple>
+
+#include <gtest/gtest.h>
 
 #include "channel/Channel.h"
 #include "support/TestPlatform.h"

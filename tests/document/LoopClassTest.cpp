@@ -1,10 +1,10 @@
 #include "document/LoopClass.h"
 
-#include <gtest/gtest.h>
-
 #include <fstream>
 #include <limits>
 #include <tuple>
+
+#include <gtest/gtest.h>
 
 #include "document/TunFile.h"
 #include "support/TestPlatform.h"

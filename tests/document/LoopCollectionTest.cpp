@@ -1,9 +1,9 @@
 #include "document/LoopCollection.h"
 
-#include <gtest/gtest.h>
-
 #include <fstream>
 #include <tuple>
+
+#include <gtest/gtest.h>
 
 #include "document/TunFile.h"
 #include "support/TestFiles.h"

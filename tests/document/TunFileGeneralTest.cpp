@@ -1,8 +1,8 @@
 #include "document/TunFileGeneral.h"
 
-#include <gtest/gtest.h>
-
 #include <tuple>
+
+#include <gtest/gtest.h>
 
 #include "document/TunerType.h"
 #include "stores/IniFile.h"

@@ -1,10 +1,10 @@
 #include "document/TunFile.h"
 
-#include <gtest/gtest.h>
-
 #include <filesystem>
 #include <fstream>
 #include <tuple>
+
+#include <gtest/gtest.h>
 
 #include "support/TestPlatform.h"
 

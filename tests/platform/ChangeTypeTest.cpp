@@ -1,6 +1,6 @@
-#include <gtest/gtest.h>
-
 #include <cmath>
+
+#include <gtest/gtest.h>
 
 #include "platform/Variant.h"
 #include "platform/fake/FixedLocale.h"

@@ -1,11 +1,11 @@
 #include "stores/InvariantNumber.h"
 
-#include <gtest/gtest.h>
-
 #include <clocale>
 #include <cmath>
 #include <limits>
 #include <random>
+
+#include <gtest/gtest.h>
 
 namespace cv {
 namespace {

@@ -1,7 +1,7 @@
-#include <gtest/gtest.h>
-
 #include <cfloat>
 #include <cmath>
+
+#include <gtest/gtest.h>
 
 #include "support/TestPlatform.h"
 #include "util/FloatText.h"

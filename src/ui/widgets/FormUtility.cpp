@@ -1,5 +1,8 @@
 #include "ui/widgets/FormUtility.h"
 
+#include <algorithm>
+#include <limits>
+
 #include <QComboBox>
 #include <QGroupBox>
 #include <QGuiApplication>
@@ -9,8 +12,6 @@
 #include <QStringList>
 #include <QVariant>
 #include <QWidget>
-#include <algorithm>
-#include <limits>
 
 namespace cv {
 

@@ -1,11 +1,12 @@
 #include "ui/widgets/LoopControls.h"
 
+#include <string>
+
 #include <QComboBox>
 #include <QListWidget>
 #include <QStringList>
 #include <QVariant>
 #include <QWidget>
-#include <string>
 
 #include "document/LoopClass.h"
 #include "util/FloatText.h"

@@ -4,10 +4,10 @@
 #include <sys/file.h>
 #include <unistd.h>
 
-#include <gtest/gtest.h>
-
 #include <filesystem>
 #include <tuple>
+
+#include <gtest/gtest.h>
 
 #include "support/FaultyCalls.h"
 #include "support/TempFolder.h"

@@ -1,11 +1,12 @@
 #include "platform/posix/FileProfiles.h"
 
-#include <gtest/gtest.h>
 #include <sys/wait.h>
 #include <unistd.h>
 
 #include <filesystem>
 #include <string>
+
+#include <gtest/gtest.h>
 
 #include "platform/posix/ProfilePath.h"
 #include "support/FaultyCalls.h"

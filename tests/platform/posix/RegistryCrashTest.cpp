@@ -2,10 +2,10 @@
 #include <sys/wait.h>
 #include <unistd.h>
 
-#include <gtest/gtest.h>
-
 #include <filesystem>
 #include <random>
+
+#include <gtest/gtest.h>
 
 #include "platform/posix/FileRegistry.h"
 #include "platform/posix/RegistryFile.h"
