@@ -5,44 +5,20 @@
 // change one description each time, so every save really replaces the file
 // (one batch: one atomic replacement, fsync included).
 
-#include <benchmark/benchmark.h>
-
+#include <cstdlib>
 #include <memory>
 #include <string>
 
+#include <benchmark/benchmark.h>
+
 #include "document/TunFile.h"
-#include "platform/fake/FixedComputerName.h"
-#include "platform/fake/FixedLocale.h"
-#include "platform/fake/FixedProgramInfo.h"
-#include "platform/fake/RecordingHelp.h"
-#include "platform/fake/ScriptedDialogs.h"
-#include "platform/fake/VirtualEventLoop.h"
-#include "platform/posix/FileProfiles.h"
-#include "platform/posix/FileRegistry.h"
-#include "support/TempFolder.h"
+#include "support/TestPlatform.h"
 
 namespace {
 
 constexpr int32_t kChannels = 200;
 constexpr int32_t kLoops = 20;
 constexpr int32_t kOpcTuner = 9;
-
-// Fakes for everything but the files, which are real ones in a temporary
-// folder.
-struct BenchPlatform {
-    cv::fake::ScriptedDialogs dialogs;
-    cv::fake::FixedLocale locale = cv::fake::FixedLocale::Point();
-    cv::fake::FixedProgramInfo program;
-    cv::fake::RecordingHelp help;
-    cv::fake::FixedComputerName computer;
-    cv::fake::VirtualEventLoop events;
-    cv::test::TempFolder folder;
-    cv::posix::FileRegistry registry{folder.Path()};
-    cv::posix::FileProfiles profiles{folder.Path()};
-    cv::RunSwitches run;
-    cv::Platform platform{dialogs, locale,   program,  help, computer,
-                          events,  registry, profiles, run};
-};
 
 // A document of kChannels charted channels and kLoops loops, saved once.
 struct SavedDocument {
@@ -64,9 +40,11 @@ struct SavedDocument {
             loop->SetDescription("Loop " + std::to_string(k));
             loop->SetPVChannel(k + 3);
         }
-        document.WriteToDisk(path);
+        if (!document.WriteToDisk(path)) {
+            std::abort();  // nothing to measure without the file
+        }
     }
-    BenchPlatform tp;
+    cv::test::TestPlatform tp;
     std::string path;
 };
 
@@ -81,7 +59,7 @@ BENCHMARK(BM_ReadDocumentWarm)->Unit(benchmark::kMillisecond);
 
 void BM_ReadDocumentCold(benchmark::State& state) {
     SavedDocument saved;
-    BenchPlatform& tp = saved.tp;
+    cv::test::TestPlatform& tp = saved.tp;
     for (auto _ : state) {
         cv::posix::FileProfiles profiles(tp.folder.Path());
         cv::Platform platform{tp.dialogs, tp.locale,   tp.program, tp.help, tp.computer,

@@ -4,12 +4,12 @@
 // checks its change stamp. Writes are measured one replacement per key and
 // as one batch for the whole document.
 
-#include <benchmark/benchmark.h>
-
 #include <fstream>
 #include <sstream>
 #include <string>
 #include <vector>
+
+#include <benchmark/benchmark.h>
 
 #include "platform/posix/FileProfiles.h"
 #include "platform/posix/IniDocument.h"
@@ -82,6 +82,7 @@ class ReparsingProfiles : public cv::platform::ProfileApi {
                                    const std::optional<std::string>&, const std::string&) override {
         return false;
     }
+    bool FileReadable(const std::string&) override { return true; }
     void BeginBatch(const std::string&) override {}
     bool EndBatch(const std::string&) override { return false; }
 };

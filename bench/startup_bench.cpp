@@ -2,7 +2,6 @@
 // window's first paint (the program's --quit-when-shown option), on Qt's
 // offscreen platform. Run with the median of the repetitions as the figure.
 
-#include <benchmark/benchmark.h>
 #include <fcntl.h>
 #include <spawn.h>
 #include <sys/wait.h>
@@ -11,6 +10,8 @@
 #include <cstdlib>
 #include <string>
 #include <vector>
+
+#include <benchmark/benchmark.h>
 
 #include "support/TempFolder.h"
 

@@ -1,20 +1,13 @@
-# cv_add_library(<name> DIRS <folders...> [EXCLUDE <regex>] [ONLY <regex>] [LIBS <targets...>] [QT])
-# One static library from every .cpp file of the given folders; new files are
-# picked up without editing a list. A library whose folders hold no source
-# yet is an interface library, so the tree always configures.
+# cv_add_library(<name> [DIRS <folders...>] [TREES <folders...>] [EXCLUDE <files...>]
+#                [LIBS <targets...>] [QT])
+# One static library from every .cpp file of the given folders (DIRS: the
+# folder itself; TREES: the folder and everything below it); new files are
+# picked up without editing a list. EXCLUDE names single files (relative to
+# the calling folder) that belong elsewhere. A library whose folders hold no
+# source yet is an interface library, so the tree always configures.
 function(cv_add_library name)
-    cmake_parse_arguments(ARG "QT" "EXCLUDE;ONLY" "DIRS;LIBS" ${ARGN})
-    set(sources)
-    foreach(dir ${ARG_DIRS})
-        file(GLOB found CONFIGURE_DEPENDS ${dir}/*.cpp)
-        list(APPEND sources ${found})
-    endforeach()
-    if(ARG_EXCLUDE)
-        list(FILTER sources EXCLUDE REGEX "${ARG_EXCLUDE}")
-    endif()
-    if(ARG_ONLY)
-        list(FILTER sources INCLUDE REGEX "${ARG_ONLY}")
-    endif()
+    cmake_parse_arguments(ARG "QT" "" "DIRS;TREES;EXCLUDE;LIBS" ${ARGN})
+    cv_glob_sources(sources DIRS ${ARG_DIRS} TREES ${ARG_TREES} EXCLUDE ${ARG_EXCLUDE})
     if(sources)
         add_library(${name} STATIC ${sources})
         target_include_directories(${name} PUBLIC ${PROJECT_SOURCE_DIR}/src)
@@ -27,4 +20,23 @@ function(cv_add_library name)
         target_include_directories(${name} INTERFACE ${PROJECT_SOURCE_DIR}/src)
         target_link_libraries(${name} INTERFACE ${ARG_LIBS})
     endif()
+endfunction()
+
+# cv_glob_sources(<out> [DIRS <folders...>] [TREES <folders...>] [EXCLUDE <files...>])
+# The .cpp files of the folders, relative to the calling folder.
+function(cv_glob_sources out)
+    cmake_parse_arguments(ARG "" "" "DIRS;TREES;EXCLUDE" ${ARGN})
+    set(sources)
+    foreach(dir ${ARG_DIRS})
+        file(GLOB found CONFIGURE_DEPENDS ${CMAKE_CURRENT_SOURCE_DIR}/${dir}/*.cpp)
+        list(APPEND sources ${found})
+    endforeach()
+    foreach(dir ${ARG_TREES})
+        file(GLOB_RECURSE found CONFIGURE_DEPENDS ${CMAKE_CURRENT_SOURCE_DIR}/${dir}/*.cpp)
+        list(APPEND sources ${found})
+    endforeach()
+    foreach(file ${ARG_EXCLUDE})
+        list(REMOVE_ITEM sources ${CMAKE_CURRENT_SOURCE_DIR}/${file})
+    endforeach()
+    set(${out} ${sources} PARENT_SCOPE)
 endfunction()

@@ -2,13 +2,13 @@
 // every byte of the input, and that one write or erase changes what it names
 // (read back after a second parse) and no other entry.
 
-#include <fuzzer/FuzzedDataProvider.h>
-
 #include <cstdint>
 #include <cstdlib>
 #include <optional>
 #include <string>
 #include <string_view>
+
+#include <fuzzer/FuzzedDataProvider.h>
 
 #include "platform/posix/IniDocument.h"
 

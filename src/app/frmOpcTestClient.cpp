@@ -1,5 +1,7 @@
 #include "app/frmOpcTestClient.h"
 
+#include <array>
+
 #include <QCheckBox>
 #include <QGridLayout>
 #include <QGroupBox>
@@ -8,9 +10,11 @@
 #include <QLineEdit>
 #include <QPushButton>
 #include <QVBoxLayout>
-#include <array>
 
-#include "app/Utility.h"
+#include "platform/Platform.h"
+#include "ui/widgets/HelpTopics.h"
+#include "util/FloatText.h"
+#include "util/ProgramRoutines.h"
 
 namespace cv {
 

@@ -1,13 +1,13 @@
 #pragma once
 
-#include <QPointer>
-#include <QWidget>
 #include <deque>
 #include <string>
 
+#include <QPointer>
+#include <QWidget>
+
 #include "channel/Channel.h"
 #include "document/TunFile.h"
-#include "platform/Platform.h"
 
 class QCheckBox;
 class QCloseEvent;
@@ -17,6 +17,8 @@ class QLineEdit;
 class QPushButton;
 
 namespace cv {
+
+struct Platform;
 
 // The main window: names one OPC item (server, access path, item ID), its
 // scaling ranges and the sample interval, and starts the test read. Each
@@ -59,6 +61,7 @@ class frmOpcTestClient : public QWidget {
                           bool bIsMax, double dOtherLimit);
     bool CheckMinMax(double dMin, double dMax, const std::string& sSpanName);
     bool ValidateSI();
+    bool FitsRemembered(const std::string& sText);
     std::string RangeText(double dValue) const;
 
     // The remembered values (frmOpcTestClient_settings.cpp).

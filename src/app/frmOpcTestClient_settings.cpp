@@ -2,6 +2,7 @@
 #include <cmath>
 
 #include "app/frmOpcTestClient.h"
+#include "platform/Platform.h"
 #include "stores/RegClass.h"
 
 namespace cv {

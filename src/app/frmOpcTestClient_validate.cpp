@@ -1,11 +1,15 @@
+#include <cmath>
+
 #include <QCheckBox>
 #include <QCloseEvent>
 #include <QFocusEvent>
 #include <QLineEdit>
-#include <cmath>
 
-#include "app/Utility.h"
 #include "app/frmOpcTestClient.h"
+#include "platform/Platform.h"
+#include "stores/RegClass.h"
+#include "util/FloatText.h"
+#include "util/TextToNumber.h"
 
 namespace cv {
 
@@ -18,6 +22,9 @@ bool ChecksField(Qt::FocusReason reason) {
     return reason == Qt::TabFocusReason || reason == Qt::BacktabFocusReason ||
            reason == Qt::MouseFocusReason || reason == Qt::ShortcutFocusReason;
 }
+
+const std::string kTooLongText =
+    "Must be at most 254 characters long (letters outside plain ASCII count as two or more).";
 
 std::string TrimmedText(const QLineEdit& box) {
     return box.text().trimmed().toStdString();
@@ -75,10 +82,22 @@ void frmOpcTestClient::closeEvent(QCloseEvent* event) {
 bool frmOpcTestClient::Validate(QWidget* field) {
     Channel& channel = TestChannel();
     if (field == txtServerID) {
+        // Checked in the form it is remembered in: "\\Node\Server".
+        const std::string sHeld = channel.OpcNodeAndServer();
         channel.SetOpcNodeAndServer(TrimmedText(*txtServerID));
+        if (!FitsRemembered(channel.OpcNodeAndServer())) {
+            channel.SetOpcNodeAndServer(sHeld);
+            return false;
+        }
     } else if (field == txtAccessPath) {
+        if (!FitsRemembered(TrimmedText(*txtAccessPath))) {
+            return false;
+        }
         channel.SetOpcAccessPath(TrimmedText(*txtAccessPath));
     } else if (field == txtItemID) {
+        if (!FitsRemembered(TrimmedText(*txtItemID))) {
+            return false;
+        }
         channel.SetItemName(TrimmedText(*txtItemID));
     } else if (field == chkUseScaling) {
         General().SetScalePVandCO(chkUseScaling->isChecked());
@@ -148,6 +167,16 @@ bool frmOpcTestClient::ValidateSI() {
     }
     mPlatform.dialogs.MsgBox("Must be less than 61 and greater or equal to .1",
                              MsgBoxStyle::Exclamation, "");
+    return false;
+}
+
+// A longer text would be remembered but read back on the next start as
+// empty, so it is refused while the user can still change it.
+bool frmOpcTestClient::FitsRemembered(const std::string& sText) {
+    if (sText.size() <= static_cast<size_t>(RegClass::kMaxTextBytes)) {
+        return true;
+    }
+    mPlatform.dialogs.MsgBox(kTooLongText, MsgBoxStyle::Exclamation, "");
     return false;
 }
 

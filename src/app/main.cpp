@@ -6,13 +6,14 @@
 // --quit-when-shown  ends the program as soon as the main window has been
 //                    drawn for the first time (used to measure start-up).
 
-#include <QApplication>
 #include <cstdio>
 #include <cstdlib>
 #include <string_view>
 
-#include "app/Utility.h"
+#include <QApplication>
+
 #include "app/frmOpcTestClient.h"
+#include "platform/Platform.h"
 #include "platform/posix/FileProfiles.h"
 #include "platform/posix/FileRegistry.h"
 #include "platform/posix/HostComputerName.h"
@@ -21,6 +22,7 @@
 #include "platform/qt/QtDialogs.h"
 #include "platform/qt/QtEventLoop.h"
 #include "platform/qt/QtLocale.h"
+#include "util/ProgramRoutines.h"
 
 namespace {
 

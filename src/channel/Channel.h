@@ -4,20 +4,14 @@
 #include <string>
 
 #include "platform/ErrorInfo.h"
-#include "platform/Platform.h"
 #include "platform/Variant.h"
 
 namespace cv {
 
-class CvOpcAutoClient;
 class IniFile;
 class TunFile;
 class TunerType;
-
-namespace platform {
-class DdeLink;
-class OPCItem;
-}  // namespace platform
+struct Platform;
 
 // The three ranges a channel keeps; their names appear in messages.
 enum class RangeType : int32_t { Engineering = 0, Instrument = 1, Display = 2 };
@@ -139,6 +133,9 @@ class Channel {
     void SetExpectANumber(bool bExpect) { mbExpectANumber = bExpect; }
     void SetDisplayVarType(int16_t iVarType) { miDisplayVarType = iVarType; }
     bool IsOnline() const { return miState == OnlineState::Online; }
+    // The first step of going online: the channel waits for its first value
+    // (state GoingOnline); only then does a good value bring it online.
+    void MarkGoingOnline() { miState = OnlineState::GoingOnline; }
     int32_t Online(bool bTimedOut);
     void GoOffline();
     // Returns the stored error text and clears it.
@@ -153,13 +150,6 @@ class Channel {
     void OpcSetRawValue(const Variant& vValue, int32_t lQuality, double dTimeStamp,
                         bool bSingleShot);
     void OpcDataChange(const std::string& sText);
-    // The OPC client serving this channel and the channel's OPC item, set by
-    // the client when it adds the channel; neither is owned here.
-    CvOpcAutoClient* OpcClient() const { return mcOpcClient; }
-    void SetOpcClient(CvOpcAutoClient* cClient) { mcOpcClient = cClient; }
-    void SetOpcItem(platform::OPCItem* cItem) { mcOpcItem = cItem; }
-    // The element that carries the channel's DDE link, if one is attached.
-    platform::DdeLink* DdeLabel() const { return mcDdeLabel; }
     int32_t OpcServerHandle() const { return mlOpcServerHandle; }
     void SetOpcServerHandle(int32_t lHandle) { mlOpcServerHandle = lHandle; }
     int32_t OpcGroupNumber() const;
@@ -230,12 +220,9 @@ class Channel {
     std::string msTopicName;
     int16_t miDisplayVarType = 0;
     std::string msDdeApplication;
-    platform::DdeLink* mcDdeLabel = nullptr;
     std::string msOpcComputer;
     std::string msOpcServerID;
-    CvOpcAutoClient* mcOpcClient = nullptr;
     int32_t mlOpcServerHandle = 0;
-    platform::OPCItem* mcOpcItem = nullptr;
     Variant mvRawValue = Variant::Null();
     double mdTimeStamp = 0;
     int32_t mlQuality = 0;

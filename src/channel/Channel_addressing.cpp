@@ -1,7 +1,7 @@
 #include <algorithm>
 
-#include "app/Utility.h"
 #include "channel/Channel.h"
+#include "util/PathText.h"
 
 namespace cv {
 

@@ -4,6 +4,7 @@
 
 #include "channel/Channel.h"
 #include "platform/OleDate.h"
+#include "platform/Platform.h"
 
 namespace cv {
 
@@ -45,8 +46,6 @@ void Channel::GoOffline() {
             break;
         case ComTypeCode::Opc:
             mvRawValue = Variant::Null();
-            mcOpcItem = nullptr;
-            mcOpcClient = nullptr;
             break;
         default:
             mPlatform.dialogs.MsgBox("Error: Channel.GoOffline", MsgBoxStyle::OKOnly, "");

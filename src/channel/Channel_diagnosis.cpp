@@ -1,8 +1,9 @@
 #include <cstdio>
 #include <initializer_list>
 
-#include "app/Utility.h"
 #include "channel/Channel.h"
+#include "platform/Platform.h"
+#include "util/ProgramRoutines.h"
 
 namespace cv {
 

@@ -3,6 +3,7 @@
 
 #include "channel/Channel.h"
 #include "channel/FixedPoint.h"
+#include "platform/Platform.h"
 
 namespace cv {
 

@@ -1,5 +1,7 @@
-#include "app/Utility.h"
 #include "channel/Channel.h"
+
+#include "platform/Platform.h"
+#include "util/ProgramRoutines.h"
 
 namespace cv {
 
@@ -45,9 +47,12 @@ void Channel::OpcSetRawValue(const Variant& vValue, int32_t lQuality, double dTi
     }
     mlQuality = (lQuality & ~kWarnedMark) | (mlQuality & kWarnedMark);
 
+    // Only a channel waiting for its first value comes online: a late value
+    // reaching a channel that went offline (timed out, its client released)
+    // is kept but brings nothing back.
     const int32_t lKind = lQuality & kQualityMask;
     if (miComType == ComTypeCode::Opc && (lKind == kQualityGood || lKind == kQualityUncertain)) {
-        if (miState != OnlineState::Online) {
+        if (miState == OnlineState::GoingOnline) {
             miState = OnlineState::Online;
             ProveNumber();
         }

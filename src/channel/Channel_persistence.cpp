@@ -1,4 +1,5 @@
 #include "channel/Channel.h"
+
 #include "document/TunerType.h"
 #include "stores/IniFile.h"
 

@@ -3,6 +3,7 @@
 #include <cmath>
 
 #include "channel/Channel.h"
+#include "platform/Platform.h"
 
 namespace cv {
 

@@ -1,4 +1,5 @@
 #include "channel/Channel.h"
+
 #include "channel/SpecificChannelKeys.h"
 #include "channel/TunerKindCode.h"
 #include "document/TunFile.h"

@@ -1,8 +1,9 @@
 #include <cmath>
 
-#include "app/Utility.h"
 #include "channel/Channel.h"
 #include "document/TunFile.h"
+#include "platform/Platform.h"
+#include "util/TextToNumber.h"
 
 namespace cv {
 

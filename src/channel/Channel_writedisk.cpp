@@ -1,30 +1,11 @@
 #include "channel/Channel.h"
+
 #include "channel/SpecificChannelKeys.h"
 #include "channel/TunerKindCode.h"
 #include "document/TunerType.h"
 #include "stores/IniFile.h"
 
 namespace cv {
-
-namespace {
-
-bool IsBlank(char cChar) {
-    return cChar == ' ' || cChar == '\t' || cChar == '\r' || cChar == '\v' || cChar == '\f';
-}
-
-// A read strips blanks at either end and one pair of enclosing quotes; such
-// a text goes in single quotes, which the read takes off again. Every other
-// text is stored as it is.
-void WriteText(IniFile& cIni, const std::string& sSection, const std::string& sItem,
-               const std::string& sValue) {
-    const bool bQuoted = sValue.size() >= 2 && sValue.front() == sValue.back() &&
-                         (sValue.front() == '\'' || sValue.front() == '"');
-    const bool bNeedsQuotes =
-        !sValue.empty() && (IsBlank(sValue.front()) || IsBlank(sValue.back()) || bQuoted);
-    cIni.WriteString(sSection, sItem, sValue, bNeedsQuotes);
-}
-
-}  // namespace
 
 void Channel::WriteToDisk(IniFile& cSharedIni, IniFile& cIni, cv::TunerType& cTuner) {
     if (miSpecificChannelType != 0) {
@@ -47,15 +28,15 @@ void Channel::WriteSpecificToDisk(IniFile& cIni, int32_t lTuner) {
     }
     const std::string sPrefix = lTuner == TunerKindCode::OpcTuner ? "OPC" : "DDE";
     const std::string sKey = keys->sSendKey != nullptr ? keys->sSendKey : sPrefix + keys->sReadKey;
-    WriteText(cIni, sPrefix, sKey, msItemName);
+    cIni.WriteText(sPrefix, sKey, msItemName);
     if (!keys->bFilter || keys->sSendKey != nullptr) {
         return;
     }
     if (lTuner == TunerKindCode::OpcTuner) {
-        WriteText(cIni, "OPC", "OPC_FilterServerID", OpcNodeAndServer());
-        WriteText(cIni, "OPC", "OPC_FilterAccessPath", msTopicName);
+        cIni.WriteText("OPC", "OPC_FilterServerID", OpcNodeAndServer());
+        cIni.WriteText("OPC", "OPC_FilterAccessPath", msTopicName);
     } else {
-        WriteText(cIni, "DDE", "DDE_FilterAppTopic", DdeAppTopic());
+        cIni.WriteText("DDE", "DDE_FilterAppTopic", DdeAppTopic());
     }
 }
 
@@ -86,13 +67,13 @@ void Channel::WriteDisplayDataToDisk(const std::string& sSection, IniFile& cShar
         cSharedIni.WriteLong("FacePlate", "LineWidth" + RoleName(), miLineWidth);
     }
     cIni.WriteLong(sSection, "DecimalPlaces", miDecimalPlaces);
-    WriteText(cIni, sSection, "Description", msDescription);
+    cIni.WriteText(sSection, "Description", msDescription);
     cIni.WriteString(sSection, "LineStyle", LineStyle());
     cIni.WriteBoolean(sSection, "DisplayOnGraph", mbDisplayOnGraph);
 }
 
 void Channel::WriteEngUnitsToDisk(IniFile& cIni, const std::string& sSection) {
-    WriteText(cIni, sSection, "EngineeringUnits", msEngUnits);
+    cIni.WriteText(sSection, "EngineeringUnits", msEngUnits);
 }
 
 void Channel::WriteArchiveAddress(IniFile& cIni, int32_t lTuner) {
@@ -102,12 +83,12 @@ void Channel::WriteArchiveAddress(IniFile& cIni, int32_t lTuner) {
             break;
         case TunerKindCode::Fenwarden:
             if (miNumber >= 4) {
-                WriteText(cIni, ChannelSection(), "LinxItem", msItemName);
+                cIni.WriteText(ChannelSection(), "LinxItem", msItemName);
             }
             break;
         case TunerKindCode::Brindlemoor:
             if (miNumber >= 4) {
-                WriteText(cIni, ChannelSection(), "Item", msItemName);
+                cIni.WriteText(ChannelSection(), "Item", msItemName);
             }
             break;
         case TunerKindCode::OpcTuner:
@@ -123,12 +104,12 @@ void Channel::WriteArchiveAddress(IniFile& cIni, int32_t lTuner) {
 void Channel::WriteArchiveDdeAddress(IniFile& cIni) {
     if (miNumber >= 4) {
         const std::string sSection = ChannelSection();
-        WriteText(cIni, sSection, "Application", msDdeApplication);
-        WriteText(cIni, sSection, "Topic", msTopicName);
-        WriteText(cIni, sSection, "Item", msItemName);
+        cIni.WriteText(sSection, "Application", msDdeApplication);
+        cIni.WriteText(sSection, "Topic", msTopicName);
+        cIni.WriteText(sSection, "Item", msItemName);
     } else if (miNumber >= 1) {
-        WriteText(cIni, "DDE", "DDE_applicationtopic", DdeAppTopic());
-        WriteText(cIni, "DDE", "DDE_item_" + RoleName(), msItemName);
+        cIni.WriteText("DDE", "DDE_applicationtopic", DdeAppTopic());
+        cIni.WriteText("DDE", "DDE_item_" + RoleName(), msItemName);
     }
 }
 
@@ -139,13 +120,13 @@ void Channel::WriteArchiveOpcAddress(IniFile& cIni) {
         miComType == ComTypeCode::OpcHda ? "OPC HDA item - No OPC Server" : OpcNodeAndServer();
     if (miNumber >= 4) {
         const std::string sSection = ChannelSection();
-        WriteText(cIni, sSection, "ServerID", sServer);
-        WriteText(cIni, sSection, "AccessPath", msTopicName);
-        WriteText(cIni, sSection, "Item", msItemName);
+        cIni.WriteText(sSection, "ServerID", sServer);
+        cIni.WriteText(sSection, "AccessPath", msTopicName);
+        cIni.WriteText(sSection, "Item", msItemName);
     } else if (miNumber >= 1) {
-        WriteText(cIni, "OPC", "OPC_ServerID", sServer);
-        WriteText(cIni, "OPC", "OPC_AccessPath", msTopicName);
-        WriteText(cIni, "OPC", "OPC_item_" + RoleName(), msItemName);
+        cIni.WriteText("OPC", "OPC_ServerID", sServer);
+        cIni.WriteText("OPC", "OPC_AccessPath", msTopicName);
+        cIni.WriteText("OPC", "OPC_item_" + RoleName(), msItemName);
     }
 }
 

@@ -1,10 +1,9 @@
 #include "channel/FixedPoint.h"
 
-#include "platform/DecimalText.h"
-
 #include <algorithm>
 #include <cmath>
-#include <cstdio>
+
+#include "platform/DecimalText.h"
 
 namespace cv {
 
@@ -13,27 +12,18 @@ namespace {
 constexpr int kSignificantDigits = 15;
 constexpr double kExponentFormFrom = 1e15;
 
+// 1.50E+20 for two places: the mantissa keeps its trailing zeros. Only for
+// values of 1E15 and beyond, so the exponent is positive.
 std::string ExponentForm(double dValue, int32_t lPlaces, const std::string& sDecimal) {
-    char buffer[64];
-    std::snprintf(buffer, sizeof buffer, "%.*E", static_cast<int>(lPlaces), dValue);
-    std::string sText = buffer;
-    const size_t p = sText.find('.');
-    if (p != std::string::npos) {
-        sText.replace(p, 1, sDecimal);
+    const DecimalDigits number = RoundToSignificant(dValue, lPlaces + 1);
+    std::string sDigits = number.digits;
+    sDigits.resize(static_cast<size_t>(lPlaces) + 1, '0');
+    std::string sText = number.negative ? "-" : "";
+    sText += sDigits.front();
+    if (lPlaces > 0) {
+        sText += sDecimal + sDigits.substr(1);
     }
-    return sText;
-}
-
-// Adds one unit in the last digit; true when a carry leaves the front.
-bool IncrementDigits(std::string& sDigits) {
-    for (size_t i = sDigits.size(); i-- > 0;) {
-        if (sDigits[i] != '9') {
-            ++sDigits[i];
-            return false;
-        }
-        sDigits[i] = '0';
-    }
-    return true;
+    return sText + "E+" + std::to_string(number.exponent);
 }
 
 // The digits of |dValue| rounded to lPlaces decimals; lIntDigits receives

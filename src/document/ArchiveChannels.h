@@ -6,13 +6,13 @@
 #include <vector>
 
 #include "channel/Channel.h"
-#include "platform/Platform.h"
 
 namespace cv {
 
 class IniFile;
 class TunFile;
 class TunerType;
+struct Platform;
 
 // The charted channels of a tuning document: channel 1 is the PV, 2 the CO,
 // 3 the SP, higher numbers are extra charted channels. The collection owns

@@ -5,6 +5,7 @@
 
 #include "document/TunerType.h"
 #include "platform/AsciiCase.h"
+#include "platform/Platform.h"
 
 namespace cv {
 

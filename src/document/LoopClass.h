@@ -4,11 +4,10 @@
 #include <cstdint>
 #include <string>
 
-#include "platform/Platform.h"
-
 namespace cv {
 
 class TunFile;
+struct Platform;
 
 // One PID loop of a tuning document: its name, the archive channels of its
 // PV, CO and SP, the controller's algorithm text and unit conventions, and

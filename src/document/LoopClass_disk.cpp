@@ -104,16 +104,16 @@ void LoopClass::WriteToDisk(TunFile& cTunFile) {
     IniFile& ini = cTunFile.IniFileObject();
     IniFile::Batch batch(ini);
     const std::string sSection = SectionName(mlNumber);
-    ini.WriteString(sSection, "Description", msDescription);
+    ini.WriteText(sSection, "Description", msDescription);
     ini.WriteLong(sSection, "PVChannel", mlPVChannel);
     ini.WriteLong(sSection, "COChannel", mlCOChannel);
     ini.WriteLong(sSection, "SPChannel", mlSPChannel);
     // The simulation controller of this program stands for the tuner kind's
     // own default.
-    ini.WriteString(sSection, "ControllerString",
-                    msControllerString == "Corvalent Simulation"
-                        ? cTunFile.TunerTypeObj().DefaultController()
-                        : msControllerString);
+    ini.WriteText(sSection, "ControllerString",
+                  msControllerString == "Corvalent Simulation"
+                      ? cTunFile.TunerTypeObj().DefaultController()
+                      : msControllerString);
     ini.WriteLong(sSection, "response_direction", mlResponseDirection);
     ini.WriteLong(sSection, "pb_or_gain", mlPBorGain);
     ini.WriteLong(sSection, "integral_units", mlIntegralUnits);

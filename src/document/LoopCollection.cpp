@@ -49,7 +49,7 @@ LoopClass* LoopCollection::Add(int32_t /*lNumber*/, bool& bFailed) {
     LoopClass* cLoop = maLoops.back().get();
     cLoop->SetNumber(Count());
     if (mlCurrentLoop == 0) {
-        mlCurrentLoop = 1;
+        mlCurrentLoop = cLoop->Number();
     }
     return cLoop;
 }

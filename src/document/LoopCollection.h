@@ -5,11 +5,11 @@
 #include <vector>
 
 #include "document/LoopClass.h"
-#include "platform/Platform.h"
 
 namespace cv {
 
 class TunFile;
+struct Platform;
 
 // The loops of a tuning document, numbered 1 to Count without gaps, and the
 // number of the current one (0 while there is none). The collection owns
@@ -37,8 +37,8 @@ class LoopCollection {
     int32_t COChannelNumber(int32_t lLoop) const;
     int32_t SPChannelNumber(int32_t lLoop) const;
 
-    // Appends a new loop numbered Count (lNumber is not used) and makes it
-    // current when there is no current loop. bFailed is set when the loop
+    // Appends a new loop numbered Count (lNumber is not used) and makes that
+    // new loop current when there is no current loop. bFailed is set when the loop
     // could not be made; the result is then null.
     LoopClass* Add(int32_t lNumber, bool& bFailed);
 

@@ -5,11 +5,11 @@
 #include <vector>
 
 #include "channel/Channel.h"
-#include "platform/Platform.h"
 
 namespace cv {
 
 class TunFile;
+struct Platform;
 
 // Loop-specific channel types (Channel::SpecificChannelType).
 namespace SpecificType {

@@ -1,6 +1,5 @@
 #include "document/TunFile.h"
 
-#include "app/Utility.h"
 #include "document/CorvalentIni.h"
 
 namespace cv {
@@ -12,7 +11,7 @@ TunFile::TunFile(Platform& platform)
       mcLoops(std::make_unique<LoopCollection>(platform)),
       mcIniFile(platform.profiles),
       mcTunerType(platform),
-      mcGeneral(platform) {}
+      mcGeneral(std::make_unique<TunFileGeneral>(platform)) {}
 
 TunFile::~TunFile() = default;
 
@@ -36,10 +35,17 @@ bool TunFile::ReadFromDisk(int32_t lTuner, const std::string& sPath) {
         ShowError("Error: TunFile.ReadFromDisk(2)");
         return false;
     }
+    // A mistyped or unreadable path would otherwise read as a document of
+    // defaults, and the next save would create a file under that name.
+    if (!mPlatform.profiles.FileReadable(sPath)) {
+        ShowError("Error: TunFile.ReadFromDisk(3)\r\n\r\nThe tuning file \"" + sPath +
+                  "\" is missing or cannot be read.");
+        return false;
+    }
     mcTunerType.SetTuner(lTuner);
     mcIniFile.SetFileName(sPath);
     ConvertFileFormat();
-    mcGeneral.ReadFromDisk(mcIniFile);
+    mcGeneral->ReadFromDisk(mcIniFile);
     mcArchives->ReadFromDisk(*this);
     mcSpecifics->ReadFromDisk(*this);
     if (mcTunerType.HasFaceplate()) {
@@ -59,15 +65,18 @@ bool TunFile::WriteToDisk(const std::string& sPath) {
     IniFile cShared = CorvalentIni(mPlatform);
     IniFile::Batch cSharedBatch(cShared);
     IniFile::Batch cBatch(mcIniFile);
-    mcGeneral.WriteToDisk(mcIniFile, mcTunerType);
+    mcGeneral->WriteToDisk(mcIniFile, mcTunerType);
     mcArchives->WriteToDisk(mcIniFile, mcTunerType);
     if (mcTunerType.HasFaceplate()) {
         mcSpecifics->WriteToDisk(*this);
     }
     mcLoops->WriteToDisk(*this);
-    cSharedBatch.End();
-    if (!cBatch.End()) {
+    const bool bSharedStored = cSharedBatch.End();
+    const bool bStored = cBatch.End();
+    if (!bStored) {
         mcIniFile.SetFileName(std::move(sFormerPath));
+    }
+    if (!bStored || !bSharedStored) {
         ShowError("Error: TunFile.WriteToDisk");
         return false;
     }
@@ -77,6 +86,12 @@ bool TunFile::WriteToDisk(const std::string& sPath) {
 void TunFile::SetArchives(std::unique_ptr<ArchiveChannels> cArchives) {
     if (cArchives != nullptr) {
         mcArchives = std::move(cArchives);
+    }
+}
+
+void TunFile::SetGeneral(std::unique_ptr<TunFileGeneral> cGeneral) {
+    if (cGeneral != nullptr) {
+        mcGeneral = std::move(cGeneral);
     }
 }
 

@@ -11,10 +11,11 @@
 #include "document/SpecificChannels.h"
 #include "document/TunFileGeneral.h"
 #include "document/TunerType.h"
-#include "platform/Platform.h"
 #include "stores/IniFile.h"
 
 namespace cv {
+
+struct Platform;
 
 // The tuning document: owns the charted channels, the loop-specific
 // channels, the loops, the INI store of its tuning file, the tuner kind, the
@@ -38,13 +39,17 @@ class TunFile {
     // names the default file.
     void SetDefaults(int32_t lTuner);
     // Reads a tuning file into a fresh document; a document that already has
-    // a file name, or an empty path, is refused with a message.
+    // a file name, an empty path, and a file that is missing or cannot be
+    // read are refused with a message, leaving the document as it was. A
+    // file that merely lacks keys reads their defaults.
     bool ReadFromDisk(int32_t lTuner, const std::string& sPath);
     // Writes the document to sPath as one replacement of the file (and one
-    // of the shared settings file): other programs see all of the save or
-    // none of it. False, with a message and the old file name kept, when the
-    // path is empty or the file could not be stored.
-    bool WriteToDisk(const std::string& sPath);
+    // of the shared settings file, which holds the colours and widths of PV,
+    // CO and SP): other programs see all of each file's part or none of it.
+    // False with a message when the path is empty or either part could not
+    // be stored whole (a text the file refuses fails its part); the document
+    // keeps its old file name unless the tuning file itself was stored.
+    [[nodiscard]] bool WriteToDisk(const std::string& sPath);
     // Upgrades keys that files of version 12.07.99 and before held in an
     // older form.
     void ConvertFileFormat();
@@ -76,8 +81,10 @@ class TunFile {
     cv::TunerType& TunerTypeObj() { return mcTunerType; }
     const cv::TunerType& TunerTypeObj() const { return mcTunerType; }
 
-    TunFileGeneral& General() { return mcGeneral; }
-    const TunFileGeneral& General() const { return mcGeneral; }
+    TunFileGeneral& General() { return *mcGeneral; }
+    const TunFileGeneral& General() const { return *mcGeneral; }
+    // Null settings are ignored: the document always has them.
+    void SetGeneral(std::unique_ptr<TunFileGeneral> cGeneral);
     // Created empty; filled by the callers through its own operations.
     ModeMapClass& ModeMap() { return mcModeMap; }
     const ModeMapClass& ModeMap() const { return mcModeMap; }
@@ -112,7 +119,7 @@ class TunFile {
     std::unique_ptr<LoopCollection> mcLoops;
     IniFile mcIniFile;
     cv::TunerType mcTunerType;
-    TunFileGeneral mcGeneral;
+    std::unique_ptr<TunFileGeneral> mcGeneral;
     ModeMapClass mcModeMap;
 };
 

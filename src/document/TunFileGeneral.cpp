@@ -2,6 +2,8 @@
 
 #include <cmath>
 
+#include "platform/Platform.h"
+
 namespace cv {
 
 namespace {

@@ -6,12 +6,12 @@
 
 #include "document/ModeEntry.h"
 #include "document/ModeMapClass.h"
-#include "platform/Platform.h"
 
 namespace cv {
 
 class IniFile;
 class TunerType;
+struct Platform;
 
 // The settings of a tuning document that belong to no single loop or
 // channel: sample interval, DDE link behaviour and time-out, scaling

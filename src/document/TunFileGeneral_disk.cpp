@@ -2,6 +2,7 @@
 
 #include "document/TunFileGeneral.h"
 #include "document/TunerType.h"
+#include "platform/Platform.h"
 #include "stores/IniFile.h"
 
 namespace cv {
@@ -64,8 +65,8 @@ void TunFileGeneral::WriteToDisk(IniFile& cTunFile, cv::TunerType& cTunerType) {
         cTunFile.WriteBoolean(kDDE, "DDE_ScalePVandCO", mbScalePVandCO);
         cTunFile.WriteBoolean(kDDE, "DDE_ScaleSP", mbScaleSP);
         cTunFile.WriteBoolean(kDDE, "DDE_ABIntegerFile", mbABIntegerFile);
-        cTunFile.WriteString(kDDE, "DDE_Item_AutoModeDetect", AutoModeDetect());
-        cTunFile.WriteString(kDDE, "DDE_Item_ManualModeDetect", ManualModeDetect());
+        cTunFile.WriteText(kDDE, "DDE_Item_AutoModeDetect", AutoModeDetect());
+        cTunFile.WriteText(kDDE, "DDE_Item_ManualModeDetect", ManualModeDetect());
         WriteModes(cTunFile);
     }
     cTunFile.EraseItem("PIDTuningSelections", "Engineering_Units");
@@ -85,8 +86,8 @@ void TunFileGeneral::WriteModes(IniFile& cTunFile) {
     }
     for (int32_t k = 1; k <= lUserModes; ++k) {
         const std::string s = std::to_string(k);
-        cTunFile.WriteString(kDDE, "ModeKey" + s, ModeKey(k + kMinModes));
-        cTunFile.WriteString(kDDE, "ModeValue" + s, ModeValue(k + kMinModes));
+        cTunFile.WriteText(kDDE, "ModeKey" + s, ModeKey(k + kMinModes));
+        cTunFile.WriteText(kDDE, "ModeValue" + s, ModeValue(k + kMinModes));
         cTunFile.WriteBoolean(kDDE, "ModeAuto" + s, ModeAuto(k + kMinModes));
     }
     for (int32_t k = lUserModes + 1; k <= lStored; ++k) {

@@ -1,4 +1,6 @@
 #include "document/TunFile.h"
+
+#include "platform/Platform.h"
 #include "platform/Variant.h"
 
 namespace cv {

@@ -3,10 +3,11 @@
 #include <chrono>
 #include <cstdio>
 
-#include "app/Utility.h"
 #include "document/TunFile.h"
 #include "platform/AsciiCase.h"
+#include "platform/Platform.h"
 #include "stores/InvariantNumber.h"
+#include "util/PathText.h"
 
 namespace cv {
 

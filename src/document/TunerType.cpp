@@ -2,6 +2,8 @@
 
 #include <array>
 
+#include "platform/Platform.h"
+
 namespace cv {
 
 // One kind of the family of tuning programs, by its code.

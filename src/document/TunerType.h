@@ -3,9 +3,9 @@
 #include <cstdint>
 #include <string>
 
-#include "platform/Platform.h"
-
 namespace cv {
+
+struct Platform;
 
 // One row of the kind table; defined beside the table.
 struct TunerKindRow;

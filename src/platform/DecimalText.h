@@ -15,8 +15,14 @@ struct DecimalDigits {
     int32_t exponent = 0;
 };
 
-// significant is taken between 1 and 17. The value must be finite.
+// significant is taken between 1 and 17. The value must be finite. Ties
+// round away from zero, as the automation library's number texts do, also
+// for exact binary ties (654322.25 to 7 digits is 654322.3).
 DecimalDigits RoundToSignificant(double value, int32_t significant);
+
+// Adds one unit in the last of the decimal digits; true when a carry leaves
+// the front (all nines become zeros).
+bool IncrementDigits(std::string& digits);
 
 // Writes the number the way printf's %G does with the given precision, but
 // with decimalSeparator for the point: plainly when -4 <= exponent <

@@ -8,7 +8,7 @@ namespace cv {
 // A failure handed back instead of thrown: the error model's number (13 type
 // mismatch, 6 overflow, 429 object creation, HRESULTs as signed 32-bit) and
 // its description. Number 0 means success.
-struct ErrorInfo {
+struct [[nodiscard]] ErrorInfo {
     int32_t Number = 0;
     std::string Description;
 

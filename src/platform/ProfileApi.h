@@ -35,11 +35,18 @@ class ProfileApi {
                                            const std::optional<std::string>& value,
                                            const std::string& fileName) = 0;
 
+    // Whether fileName names a file that can be read: false when it is
+    // missing, a folder, or cannot be read (no permission, an I/O error). An
+    // empty file can be read.
+    virtual bool FileReadable(const std::string& fileName) = 0;
+
     // From BeginBatch to its matching EndBatch, writes to fileName are held in
     // memory: every read through this object sees them at once, other programs
     // see them only when the outermost EndBatch stores them all with one
     // replacement of the file. Batches nest. EndBatch returns false when the
-    // store failed; the batch's writes are then lost and the file is unchanged.
+    // store failed or a write of the batch was refused (a batch is stored
+    // whole or not at all); the batch's writes are then lost and the file is
+    // unchanged.
     virtual void BeginBatch(const std::string& fileName) = 0;
     virtual bool EndBatch(const std::string& fileName) = 0;
 };

@@ -107,7 +107,9 @@ std::optional<double> NumberOf(const Variant& value) {
 
 std::string TextOf(const Variant& value, const platform::Locale& locale) {
     Variant text;
-    ChangeType(text, value, VT_BSTR, locale);
+    if (ChangeType(text, value, VT_BSTR, locale)) {
+        return {};
+    }
     return text.AsStr();
 }
 

@@ -1,6 +1,7 @@
 #include "stores/IniFile.h"
 
 #include <algorithm>
+#include <limits>
 
 #include "stores/InvariantNumber.h"
 
@@ -23,6 +24,11 @@ unsigned int LetterNibble(char cLetter) {
         return static_cast<unsigned int>(lower - 'c') + 9;
     }
     return 0;
+}
+
+// The blanks a read strips from either end of a value.
+bool IsBlank(char cChar) {
+    return cChar == ' ' || cChar == '\t' || cChar == '\r' || cChar == '\v' || cChar == '\f';
 }
 
 }  // namespace
@@ -61,11 +67,24 @@ std::string IniFile::Stored(const std::string& sText) const {
 }
 
 std::string IniFile::ReadEntry(const std::string& sSection, const std::string& sItem,
-                               const std::string& sDefault) const {
+                               const std::string& sDefault, int32_t lBufferSize) const {
     std::string value = mcProfiles.GetPrivateProfileString(
-        Stored(sSection), Stored(sItem), Stored(sDefault), kBufferSize, msFileName);
+        Stored(sSection), Stored(sItem), Stored(sDefault), lBufferSize, msFileName);
     value.resize(std::min(value.size(), value.find('\0')));
     return mbEncryptedFile ? Decrypt(value) : value;
+}
+
+// Whether sValue is what a read gives of a longer stored value: its first
+// bytes, cut by the read buffer.
+bool IniFile::IsCutOfStored(const std::string& sSection, const std::string& sItem,
+                            const std::string& sValue) const {
+    const auto lReadLimit =
+        static_cast<size_t>(mbEncryptedFile ? (kBufferSize - 1) / 2 : kBufferSize - 1);
+    if (sValue.size() != lReadLimit) {
+        return false;
+    }
+    const std::string sWhole = ReadEntry(sSection, sItem, "", std::numeric_limits<int32_t>::max());
+    return sWhole.size() > sValue.size() && sWhole.compare(0, sValue.size(), sValue) == 0;
 }
 
 void IniFile::WriteEntry(const std::string& sSection, const std::optional<std::string>& sItem,
@@ -119,7 +138,19 @@ std::string IniFile::ReadString(const std::string& sSection, const std::string& 
 
 void IniFile::WriteString(const std::string& sSection, const std::string& sItem,
                           const std::string& sValue, bool bEncloseInQuotes) {
+    if (IsCutOfStored(sSection, sItem, sValue)) {
+        return;
+    }
     WriteEntry(sSection, sItem, bEncloseInQuotes ? "'" + sValue + "'" : sValue);
+}
+
+void IniFile::WriteText(const std::string& sSection, const std::string& sItem,
+                        const std::string& sValue) {
+    const bool bQuoted = sValue.size() >= 2 && sValue.front() == sValue.back() &&
+                         (sValue.front() == '\'' || sValue.front() == '"');
+    const bool bNeedsQuotes =
+        !sValue.empty() && (IsBlank(sValue.front()) || IsBlank(sValue.back()) || bQuoted);
+    WriteString(sSection, sItem, sValue, bNeedsQuotes);
 }
 
 bool IniFile::ReadBoolean(const std::string& sSection, const std::string& sItem,
@@ -144,8 +175,10 @@ IniFile::Batch::Batch(IniFile& cIniFile)
     mcProfiles.BeginBatch(msFileName);
 }
 
+// A batch dropped without End still stores its writes; a caller that must
+// know whether they reached the file calls End.
 IniFile::Batch::~Batch() {
-    End();
+    static_cast<void>(End());
 }
 
 bool IniFile::Batch::End() {

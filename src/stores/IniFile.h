@@ -21,7 +21,9 @@ namespace cv {
 // single quotes so that blanks around it survive the read.
 //
 // Reads see at most 254 bytes of a value (the 255-byte buffer of the profile
-// functions); with EncryptedFile that is 127 bytes of plain text. A stored
+// functions); with EncryptedFile that is 127 bytes of plain text. Writing
+// back what a read gave of a longer value leaves that value whole, so a
+// value is never cut by being read and saved again. A stored
 // number beyond the 32-bit range reads as the nearest end of that range
 // before any clamping.
 //
@@ -60,6 +62,12 @@ class IniFile {
                            const std::string& sDefault) const;
     void WriteString(const std::string& sSection, const std::string& sItem,
                      const std::string& sValue, bool bEncloseInQuotes = false);
+    // Writes a text so that ReadString gives it back whole: one a read would
+    // strip (blanks at either end, one pair of enclosing quotes) goes in
+    // single quotes, which the read takes off again; any other text is
+    // stored as it is.
+    void WriteText(const std::string& sSection, const std::string& sItem,
+                   const std::string& sValue);
     bool ReadBoolean(const std::string& sSection, const std::string& sItem, bool bDefault) const;
     void WriteBoolean(const std::string& sSection, const std::string& sItem, bool bValue);
 
@@ -76,9 +84,11 @@ class IniFile {
         Batch(const Batch&) = delete;
         Batch& operator=(const Batch&) = delete;
 
-        // Stores the writes now; true when they reached the file. Only the
-        // first call stores; later calls return false.
-        bool End();
+        // Stores the writes now; true when they all reached the file. A write
+        // the file refused (a value with a line break) fails the whole batch,
+        // which then stores nothing. Only the first call stores; later calls
+        // return false.
+        [[nodiscard]] bool End();
 
       private:
         platform::ProfileApi& mcProfiles;
@@ -88,7 +98,9 @@ class IniFile {
 
   private:
     std::string ReadEntry(const std::string& sSection, const std::string& sItem,
-                          const std::string& sDefault) const;
+                          const std::string& sDefault, int32_t lBufferSize = kBufferSize) const;
+    bool IsCutOfStored(const std::string& sSection, const std::string& sItem,
+                       const std::string& sValue) const;
     void WriteEntry(const std::string& sSection, const std::optional<std::string>& sItem,
                     const std::optional<std::string>& sValue);
     std::string Stored(const std::string& sText) const;

@@ -1,9 +1,11 @@
 #include "stores/InvariantNumber.h"
 
-#include <array>
 #include <charconv>
 #include <cmath>
 #include <limits>
+#include <system_error>
+
+#include "platform/DecimalText.h"
 
 namespace cv {
 
@@ -13,38 +15,7 @@ constexpr int kSignificantDigits = 15;
 constexpr int kLowestPlainExponent = -4;
 constexpr int kHighestPlainExponent = 14;
 
-// The number rounded to 15 significant digits: digits (no trailing zeros,
-// at least one) and the decimal exponent of the first of them.
-struct Rounded {
-    bool negative = false;
-    std::string digits;
-    int exponent = 0;
-};
-
-Rounded RoundTo15(double dValue) {
-    std::array<char, 40> text{};
-    const auto end = std::to_chars(text.data(), text.data() + text.size(), dValue,
-                                   std::chars_format::scientific, kSignificantDigits - 1)
-                         .ptr;
-    const std::string_view scientific(text.data(), static_cast<size_t>(end - text.data()));
-    Rounded rounded;
-    rounded.negative = scientific.front() == '-';
-    const size_t first = rounded.negative ? 1 : 0;
-    const size_t e = scientific.find('e');
-    for (size_t i = first; i < e; ++i) {
-        if (scientific[i] != '.') {
-            rounded.digits += scientific[i];
-        }
-    }
-    rounded.digits.erase(rounded.digits.find_last_not_of('0') + 1);
-    size_t exponentStart = e + 1;
-    exponentStart += scientific[exponentStart] == '+' ? 1 : 0;
-    std::from_chars(scientific.data() + exponentStart, scientific.data() + scientific.size(),
-                    rounded.exponent);
-    return rounded;
-}
-
-std::string PlainText(const Rounded& cNumber) {
+std::string PlainText(const DecimalDigits& cNumber) {
     const int count = static_cast<int>(cNumber.digits.size());
     if (cNumber.exponent < 0) {
         return "." + std::string(static_cast<size_t>(-cNumber.exponent - 1), '0') + cNumber.digits;
@@ -56,7 +27,7 @@ std::string PlainText(const Rounded& cNumber) {
     return cNumber.digits.substr(0, point) + "." + cNumber.digits.substr(point);
 }
 
-std::string ExponentText(const Rounded& cNumber) {
+std::string ExponentText(const DecimalDigits& cNumber) {
     std::string text = cNumber.digits.substr(0, 1);
     if (cNumber.digits.size() > 1) {
         text += "." + cNumber.digits.substr(1);
@@ -111,7 +82,7 @@ std::string InvariantText(double dValue) {
     if (dValue == 0) {
         return "0";
     }
-    const Rounded number = RoundTo15(dValue);
+    const DecimalDigits number = RoundToSignificant(dValue, kSignificantDigits);
     const bool plain =
         number.exponent >= kLowestPlainExponent && number.exponent <= kHighestPlainExponent;
     return (number.negative ? "-" : "") + (plain ? PlainText(number) : ExponentText(number));

@@ -12,7 +12,7 @@ using namespace platform;
 
 // The text buffer handed with every string or name query: 256 bytes less
 // one, so data of up to 255 bytes (a text of 254 and its NUL) can be read.
-constexpr int32_t kTextBufferBytes = 255;
+constexpr int32_t kTextBufferBytes = RegClass::kMaxTextBytes + 1;
 constexpr int32_t kDwordBytes = 4;
 
 bool HasType(int32_t lWanted, int32_t lGot, size_t lSize) {

@@ -29,6 +29,8 @@ class RegClass {
   public:
     // Larger slot counts are cut to this.
     static constexpr int32_t kMaxEnumSlots = 4096;
+    // The longest text ReadString gives back, in bytes.
+    static constexpr int32_t kMaxTextBytes = 254;
 
     explicit RegClass(platform::RegistryApi& cRegistry);
 

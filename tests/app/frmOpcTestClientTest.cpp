@@ -1,12 +1,13 @@
+#include <filesystem>
+#include <fstream>
+#include <memory>
+
 #include <QCheckBox>
 #include <QLabel>
 #include <QLineEdit>
 #include <QPushButton>
 #include <QWindow>
 #include <QtTest>
-#include <filesystem>
-#include <fstream>
-#include <memory>
 
 #include "app/frmOpcTestClient.h"
 #include "stores/RegClass.h"
@@ -16,6 +17,8 @@ namespace {
 
 const std::string kEngTooClose = "Eng span Min must be more than .05 from Max.";
 const std::string kSIRange = "Must be less than 61 and greater or equal to .1";
+const std::string kTooLong =
+    "Must be at most 254 characters long (letters outside plain ASCII count as two or more).";
 const std::string kKey = "Software\\Corvalent\\TestClient";
 const QStringList kFirstRunBoxes = {"", "", "", "0", "100", "0", "100", "1"};
 
@@ -214,6 +217,32 @@ class frmOpcTestClientTest : public QObject {
         Enter("txtSI", "0.1234");
         QCOMPARE(SIinMSec(), 125);
         QCOMPARE(Box("txtSI")->text(), QStringLiteral("0.125"));
+    }
+
+    // The registry gives back 254 bytes; a longer text would be remembered
+    // but come back empty on the next start.
+    void textsTooLongToRememberAreRefused() {
+        const QString item(254, 'i');
+        Enter("txtItemID", item);
+        QVERIFY(Messages().empty());
+        QCOMPARE(Channel().ItemName(), item.toStdString());
+        Type("txtItemID", item + "j");
+        Leave();
+        QCOMPARE(Messages().size(), size_t{1});
+        QCOMPARE(Messages()[0].text, kTooLong);
+        QCOMPARE(Focused(), QStringLiteral("txtItemID"));
+        QCOMPARE(Channel().ItemName(), item.toStdString());
+        // A server is remembered with two leading backslashes: 254 typed, 255 kept.
+        Type("txtServerID", "\\N\\" + QString(251, 's'));
+        Leave();
+        QCOMPARE(Messages().size(), size_t{2});
+        QCOMPARE(Channel().OpcNodeAndServer(), std::string());
+        // Letters beyond ASCII take two bytes each (pasted: keys type ASCII only).
+        Type("txtAccessPath", "");
+        Box("txtAccessPath")->setText(QString(128, QChar(0xE9)));
+        Leave();
+        QCOMPARE(Messages().size(), size_t{3});
+        QCOMPARE(Channel().OpcAccessPath(), std::string());
     }
 
     void junkAndHugeNumbersNeverReachTheChannel() {

@@ -1,10 +1,10 @@
-#include <gtest/gtest.h>
-
 #include <initializer_list>
 #include <memory>
 #include <sstream>
 #include <string>
 #include <tuple>
+
+#include <gtest/gtest.h>
 
 #include "channel/Channel.h"
 #include "document/TunFile.h"
@@ -260,6 +260,16 @@ TEST_F(ChannelDisk, WriteThenReadLosesNothingTheFormatKeeps) {
         Write(lTuner, *c);
         EXPECT_EQ(Kept(*Read(lTuner, 5)), Kept(*c)) << lTuner;
     }
+    // Charted channels 4 and above keep application and topic apart, so a
+    // bar or blanks in either survive reading and writing back.
+    Ini().WriteString("Channel6", "Application", "Ex|cel");
+    Ini().WriteString("Channel6", "Topic", " Sheet 1 ", true);
+    auto dde = Read(1, 6);
+    EXPECT_EQ(std::tuple(dde->DdeApplication(), dde->TopicName()),
+              std::tuple("Ex|cel", " Sheet 1 "));
+    Write(1, *dde);
+    EXPECT_EQ(std::tuple(Tun("Channel6", "Application"), Tun("Channel6", "Topic")),
+              std::tuple("Ex|cel", " Sheet 1 "));
 }
 
 TEST_F(ChannelDisk, CopyFromTakesExactlyTheListedFields) {

@@ -1,6 +1,6 @@
-#include <gtest/gtest.h>
-
 #include <cmath>
+
+#include <gtest/gtest.h>
 
 #include "channel/Channel.h"
 #include "channel/FixedPoint.h"
@@ -62,6 +62,9 @@ TEST(FixedPoint, RoundsHalfAwayFromZeroAndKeepsOutlandishInputsShort) {
     EXPECT_EQ(FormatFixedPoint(1.5, 2147483647, "."), "1.500000000000000");
     EXPECT_EQ(FormatFixedPoint(1e20, 2, ","), "1,00E+20");
     EXPECT_EQ(FormatFixedPoint(-1e300, 1, "."), "-1.0E+300");
+    EXPECT_EQ(FormatFixedPoint(-2.5e15, 0, "."), "-3E+15");  // exact binary ties too
+    EXPECT_EQ(FormatFixedPoint(1.25e15, 1, ","), "1,3E+15");
+    EXPECT_EQ(FormatFixedPoint(1234567890123.125, 2, "."), "1234567890123.13");
     EXPECT_EQ(FormatFixedPoint(NAN, 2, "."), "NaN");
     EXPECT_EQ(FormatFixedPoint(-INFINITY, 2, "."), "-Infinity");
     EXPECT_LE(FormatFixedPoint(-999999999999999.0, kMaxFixedPlaces, ".").size(), 40u);

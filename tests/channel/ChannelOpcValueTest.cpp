@@ -1,8 +1,8 @@
-#include <gtest/gtest.h>
-
 #include <chrono>
 #include <memory>
 #include <tuple>
+
+#include <gtest/gtest.h>
 
 #include "channel/Channel.h"
 #include "platform/OleDate.h"
@@ -28,6 +28,7 @@ struct OpcChannel : testing::Test {
 
 TEST_F(OpcChannel, ArraysBecomeLinesAndTextsStopAtNul) {
     channel.SetExpectANumber(false);
+    channel.MarkGoingOnline();
     channel.OpcSetRawValue(
         Variant::Array(VT_R8, {Variant::R8(1), Variant::R8(2.5), Variant::R8(-3)}, 1), kGood, 4.5,
         false);
@@ -39,18 +40,17 @@ TEST_F(OpcChannel, ArraysBecomeLinesAndTextsStopAtNul) {
 }
 
 TEST_F(OpcChannel, FirstValueMustBeANumberAndQualityDecidesTheState) {
+    channel.MarkGoingOnline();
     channel.OpcSetRawValue(Variant::Str("abc"), kGood, 0, false);
     EXPECT_FALSE(channel.IsOnline());
     EXPECT_EQ(channel.ErrorStr(), "\"abc\" has been sent from the Server.  This is not a number.");
     channel.OpcSetRawValue(Variant::R8(1), 0x08, 0, false);  // bad while offline: silent
     EXPECT_EQ(std::tuple(channel.IsOnline(), channel.ErrorStr()), std::tuple(false, ""));
+    channel.MarkGoingOnline();
     channel.OpcSetRawValue(Variant::R8(2), 0x15, 0, false);  // last known, low limit
     EXPECT_EQ(std::tuple(channel.IsOnline(), channel.RawValue()), std::tuple(true, Variant::R8(2)));
-    // Dropping out releases the client (never dereferenced here).
-    channel.SetOpcClient(reinterpret_cast<CvOpcAutoClient*>(&tp));
     channel.OpcSetRawValue(Variant::R8(3), 0x08, 0, false);
     EXPECT_EQ(std::tuple(channel.IsOnline(), channel.OpcRawValueVarType()), std::tuple(false, 0));
-    EXPECT_EQ(channel.OpcClient(), nullptr);
     EXPECT_EQ(channel.ErrorStr(), "OPC Server error: \"Not connected\"");
     EXPECT_EQ(channel.ErrorStr(), "");  // told once
     channel.OpcSetRawValue(Variant::R8(4), 0x1C, 0, true);
@@ -59,7 +59,26 @@ TEST_F(OpcChannel, FirstValueMustBeANumberAndQualityDecidesTheState) {
     EXPECT_EQ(channel.ErrorStr(), "Bad value of unknown status reported by OPC Server.");
 }
 
+// A late value reaching a channel that timed out (and released its client)
+// is kept, but only a channel going online comes online.
+TEST_F(OpcChannel, OnlyAChannelGoingOnlineComesOnline) {
+    channel.MarkGoingOnline();
+    EXPECT_EQ(channel.Online(true), OnlineState::Offline);
+    EXPECT_EQ(channel.ErrorStr(), "Timed out waiting for a response");
+    for (const int32_t lQuality : {kGood, 0x14, kUncertain}) {
+        channel.OpcSetRawValue(Variant::R8(lQuality), lQuality, 0, false);
+        EXPECT_EQ(std::tuple(channel.Online(false), channel.OpcRawValueVarType()),
+                  std::tuple(OnlineState::Offline, VT_R8));
+    }
+    EXPECT_TRUE(tp.dialogs.Messages().empty());
+    channel.MarkGoingOnline();
+    channel.OpcSetRawValue(Variant::R8(5), kGood, 0, false);
+    EXPECT_EQ(std::tuple(channel.Online(false), channel.RawValue()),
+              std::tuple(OnlineState::Online, Variant::R8(5)));
+}
+
 TEST_F(OpcChannel, UncertainWarningOncePerChannelAndNoSilencesAll) {
+    channel.MarkGoingOnline();
     channel.OpcSetRawValue(Variant::R8(7), kUncertain, 0, false);
     ASSERT_TRUE(channel.IsOnline());
     ASSERT_EQ(tp.dialogs.Messages().size(), 1u);  // asked while proving the number
@@ -75,6 +94,7 @@ TEST_F(OpcChannel, UncertainWarningOncePerChannelAndNoSilencesAll) {
         auto other = std::make_unique<Channel>(tp.platform);
         other->SetComType(ComTypeCode::Opc);
         other->SetExpectANumber(bNumber);
+        other->MarkGoingOnline();
         other->OpcSetRawValue(Variant::R8(1), lQuality, 0, false);
         return other;
     };
@@ -98,6 +118,7 @@ TEST_F(OpcChannel, RequestedTypeConvertsOrEmpties) {
     test::TestPlatform comma(fake::FixedLocale::Comma());
     Channel german(comma.platform);
     german.SetComType(ComTypeCode::Opc);
+    german.MarkGoingOnline();
     german.OpcSetRawValue(Variant::R8(12.5), kGood, 0, false);
     german.SetDisplayVarType(VT_BSTR);
     EXPECT_EQ(german.RawValue(), Variant::Str("12,5"));
@@ -105,6 +126,7 @@ TEST_F(OpcChannel, RequestedTypeConvertsOrEmpties) {
     EXPECT_EQ(german.RawValue(), Variant::I2(12));
     german.SetExpectANumber(false);
     german.GoOffline();
+    german.MarkGoingOnline();
     german.OpcSetRawValue(Variant::Str("x"), kGood, 0, false);
     EXPECT_EQ(german.RawValue(), Variant());
 }
@@ -114,6 +136,7 @@ TEST_F(OpcChannel, TimeStampTimeOutAndSendResults) {
         std::chrono::time_point_cast<std::chrono::milliseconds>(std::chrono::system_clock::now()));
     EXPECT_NEAR(channel.OpcTimeStamp(), dNowUtc, 0.6);      // no value yet: now, in local time
     EXPECT_EQ(channel.Online(true), OnlineState::Offline);  // only a waiting channel times out
+    channel.MarkGoingOnline();
     channel.OpcSetRawValue(Variant::R8(1), kGood, 0, false);
     EXPECT_EQ(channel.Online(true), OnlineState::Online);
     EXPECT_EQ(channel.ErrorStr(), "");

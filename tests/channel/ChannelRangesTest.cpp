@@ -1,7 +1,7 @@
-#include <gtest/gtest.h>
-
 #include <cmath>
 #include <tuple>
+
+#include <gtest/gtest.h>
 
 #include "channel/Channel.h"
 #include "support/TestPlatform.h"
@@ -73,6 +73,7 @@ TEST_F(ChannelRanges, ScaleFactorsFollowBothRangesIncludingInverted) {
 
 TEST_F(ChannelRanges, DefaultDisplaySpanWidensInFivePercentSteps) {
     channel.SetComType(ComTypeCode::Opc);
+    channel.MarkGoingOnline();
     channel.OpcSetRawValue(Variant::R8(50), 0xC0, 0, false);
     EXPECT_FALSE(channel.SetDefaultDisplaySpan(true, 0, 0));
     EXPECT_EQ(DisplayLimits(), std::tuple(40, 65));

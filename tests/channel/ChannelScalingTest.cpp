@@ -1,6 +1,6 @@
-#include <gtest/gtest.h>
-
 #include <cmath>
+
+#include <gtest/gtest.h>
 
 #include "channel/Channel.h"
 #include "document/TunFile.h"
@@ -56,6 +56,7 @@ struct ScaledPv : testing::Test {
 TEST_F(ScaledPv, CurrentValueConvertsOnlyOnceFlagsAreSet) {
     EXPECT_EQ(channel.CurrentValue(), 0);  // offline, flags not yet set
     channel.SetComType(ComTypeCode::Opc);
+    channel.MarkGoingOnline();
     channel.OpcSetRawValue(Variant::I2(12), 0xC0, 0, false);
     EXPECT_EQ(channel.CurrentValue(), 12);
     ASSERT_TRUE(channel.NeedsScaling(tunFile));
@@ -74,6 +75,7 @@ TEST_F(ScaledPv, NonNumberFallsBackToTextUnscaledWithTheQuestion) {
     ASSERT_TRUE(channel.NeedsScaling(tunFile));
     channel.SetExpectANumber(false);
     channel.SetComType(ComTypeCode::Opc);
+    channel.MarkGoingOnline();
     channel.OpcSetRawValue(Variant::Str("7.5 kPa"), 0xC0, 0, false);
     EXPECT_FLOAT_EQ(channel.CurrentValue(), 7.5);
     ASSERT_EQ(tp.dialogs.Messages().size(), 1u);
@@ -86,6 +88,7 @@ TEST(ChannelScaling, TextValuesFollowTheRegionalSettings) {
     test::TestPlatform comma(fake::FixedLocale::Comma());
     Channel channel(comma.platform);
     channel.SetComType(ComTypeCode::Opc);
+    channel.MarkGoingOnline();
     channel.OpcSetRawValue(Variant::Str("12,5"), 0xC0, 0, false);
     ASSERT_TRUE(channel.IsOnline());
     EXPECT_EQ(channel.CurrentValue(), 12.5);

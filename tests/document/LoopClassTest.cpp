@@ -1,10 +1,10 @@
 #include "document/LoopClass.h"
 
-#include <gtest/gtest.h>
-
 #include <fstream>
 #include <limits>
 #include <tuple>
+
+#include <gtest/gtest.h>
 
 #include "document/TunFile.h"
 #include "support/TestPlatform.h"
@@ -108,7 +108,8 @@ TEST(LoopClass, WrittenLoopReadsBackWithTheStateOnlyFromWriteCurrentPIDF) {
     LoopFile f(9);
     LoopClass loop(f.tp.platform);
     loop.SetNumber(2);
-    loop.SetDescription("Steam flow");
+    loop.SetDescription(" Steam flow ");  // texts a read would trim or unquote
+    loop.SetControllerString("'Brand' PID");
     loop.SetCurrentP(12.5);
     loop.SetUnFilterPV(true);
     loop.WriteToDisk(f.tunFile);
@@ -121,7 +122,11 @@ TEST(LoopClass, WrittenLoopReadsBackWithTheStateOnlyFromWriteCurrentPIDF) {
     back.ReadFromDisk(f.tunFile);
     EXPECT_EQ(
         std::tuple(back.Description(), back.CurrentP(), back.UnFilterPV(), back.ControllerString()),
-        std::tuple("Steam flow", 12.5, true, "Corvalent Simulation"));
+        std::tuple(" Steam flow ", 12.5, true, "'Brand' PID"));
+    loop.SetControllerString("Corvalent Simulation");
+    loop.WriteToDisk(f.tunFile);
+    back.ReadFromDisk(f.tunFile);
+    EXPECT_EQ(back.ControllerString(), "Corvalent Simulation");
 
     // Another kind's simulation controller; the faceplate loop keeps no state.
     LoopFile wrong(11);

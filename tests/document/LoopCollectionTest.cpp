@@ -1,9 +1,9 @@
 #include "document/LoopCollection.h"
 
-#include <gtest/gtest.h>
-
 #include <fstream>
 #include <tuple>
+
+#include <gtest/gtest.h>
 
 #include "document/TunFile.h"
 #include "support/TestFiles.h"
@@ -69,6 +69,12 @@ TEST(LoopCollection, CopyIsDeepAndRemoveRenumbersAndLowersTheCurrentLoop) {
         f.loops.Remove(first);
     }
     EXPECT_EQ(f.loops.CurrentLoop(), 0);
+
+    // With no current loop, the loop added becomes current.
+    f.AddLoops(2);
+    f.loops.SetCurrentLoop(0);
+    f.AddLoops(1);
+    EXPECT_EQ(f.loops.CurrentLoop(), 3);
 }
 
 TEST(LoopCollection, LoopCountComesFromTheFileAndTheKind) {

@@ -1,9 +1,9 @@
 #include "document/SpecificChannels.h"
 
-#include <gtest/gtest.h>
-
 #include <fstream>
 #include <string>
+
+#include <gtest/gtest.h>
 
 #include "document/TunFile.h"
 #include "support/TestPlatform.h"

@@ -1,8 +1,8 @@
 #include "document/TunFileGeneral.h"
 
-#include <gtest/gtest.h>
-
 #include <tuple>
+
+#include <gtest/gtest.h>
 
 #include "document/TunerType.h"
 #include "stores/IniFile.h"
@@ -170,6 +170,10 @@ TEST_F(GeneralFile, WrittenSettingsReadBack) {
     general.SetSIinSec(0.035);
     general.SetScanMode(false);
     general.SetABIntegerFile(true);
+    // Texts a read would trim or unquote.
+    general.SetAutoModeDetect(" AUTO ");
+    general.SetModeCount(3);
+    general.SetMode(3, "'CAS'", "\"Cascade\" ");
     general.WriteToDisk(ini, kind);
 
     const std::string text = Slurp(path);
@@ -183,6 +187,8 @@ TEST_F(GeneralFile, WrittenSettingsReadBack) {
     back.ReadFromDisk(ini);
     EXPECT_EQ(std::tuple(back.SIinMSec(), back.ScanMode(), back.ABIntegerFile()),
               std::tuple(35, false, false));  // ABIntegerFile is never read
+    EXPECT_EQ(std::tuple(back.AutoModeDetect(), back.ModeKey(3), back.ModeValue(3)),
+              std::tuple(" AUTO ", "'CAS'", "\"Cascade\" "));
 }
 
 TEST_F(GeneralFile, ShorterModeTableErasesTheStaleKeys) {

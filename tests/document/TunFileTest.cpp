@@ -1,10 +1,10 @@
 #include "document/TunFile.h"
 
-#include <gtest/gtest.h>
-
 #include <filesystem>
 #include <fstream>
 #include <tuple>
+
+#include <gtest/gtest.h>
 
 #include "support/TestPlatform.h"
 
@@ -74,16 +74,64 @@ TEST_F(TunFileDocument, RefusedReadsAndFailedSavesKeepTheDocumentsFile) {
     EXPECT_FALSE(document.ReadFromDisk(9, ""));
     EXPECT_EQ(tp.dialogs.Last().text, "Error: TunFile.ReadFromDisk(2)");
     EXPECT_EQ(document.TunFilePath(), "");
+    // A file that is not there, or is no file, leaves the document untouched.
+    for (const std::string& path : {dataFolder.File("mistyped.tun"), dataFolder.Path()}) {
+        EXPECT_FALSE(document.ReadFromDisk(7, path));
+        EXPECT_EQ(tp.dialogs.Last().text,
+                  "Error: TunFile.ReadFromDisk(3)\r\n\r\nThe tuning file \"" + path +
+                      "\" is missing or cannot be read.");
+        EXPECT_EQ(std::tuple(document.TunFilePath(), document.TunerType(), document.IsValid()),
+                  std::tuple("", 0, false));
+    }
+    // One that merely lacks keys reads their defaults.
+    std::ofstream(dataFolder.File("empty.tun")) << "";
+    TunFile empty(tp.platform);
+    EXPECT_TRUE(empty.ReadFromDisk(9, dataFolder.File("empty.tun")));
+    EXPECT_EQ(empty.Archives().Count(), 3);
+    tp.dialogs.Clear();
 
     document.SetDefaults(9);
     EXPECT_FALSE(document.WriteToDisk(""));
     EXPECT_EQ(tp.dialogs.Last().text, "Error: TunFile.WriteToDisk");
     const std::string blocked = dataFolder.File("no-such-folder/plant.tun");
     EXPECT_FALSE(document.WriteToDisk(blocked));
-    EXPECT_EQ(tp.dialogs.Messages().size(), 3u);
+    EXPECT_EQ(tp.dialogs.Messages().size(), 2u);
     EXPECT_EQ(tp.dialogs.Last().text, "Error: TunFile.WriteToDisk");
     EXPECT_EQ(document.TunFilePath(), programFolder.File("LoopTag.tun"));
     EXPECT_FALSE(std::filesystem::exists(blocked));
+}
+
+// A save stores every part or says it did not: the shared file holds the
+// colours of PV, CO and SP, and a text the file refuses fails its part.
+TEST_F(TunFileDocument, ASaveThatLostAPartReportsIt) {
+    struct Row {
+        const char* what;
+        bool sharedBlocked;
+        const char* description;
+        bool tunStored;
+    };
+    for (const Row& row :
+         {Row{"shared file", true, "Loop", true}, Row{"refused text", false, "two\r\nlines", false},
+          Row{"whole", false, "Loop", true}}) {
+        SCOPED_TRACE(row.what);
+        test::TempFolder folder;
+        const std::string shared = tp.folder.File("Corvalen.ini");
+        std::filesystem::remove_all(shared);
+        if (row.sharedBlocked) {
+            std::filesystem::create_directory(shared);
+        }
+        TunFile doc(tp.platform);
+        doc.SetDefaults(9);
+        doc.CurrentLoop()->SetDescription(row.description);
+        tp.dialogs.Clear();
+        const bool saved = doc.WriteToDisk(folder.File("plant.tun"));
+        const bool whole = !row.sharedBlocked && row.tunStored;
+        EXPECT_EQ(saved, whole);
+        EXPECT_EQ(tp.dialogs.Messages().size(), whole ? 0u : 1u);
+        EXPECT_EQ(std::filesystem::exists(folder.File("plant.tun")), row.tunStored);
+        EXPECT_EQ(doc.TunFilePath(),
+                  row.tunStored ? folder.File("plant.tun") : programFolder.File("LoopTag.tun"));
+    }
 }
 
 TEST(TunFile, ConvertFileFormatRewritesOldWordBooleans) {
@@ -133,6 +181,7 @@ TEST_F(TunFileDocument, CurrentChannelsFollowTheCurrentLoopAndModeNeedsItsChanne
 
     Channel* mode = document.Specifics().Item(SpecificType::Mode);
     mode->SetExpectANumber(false);
+    mode->MarkGoingOnline();
     mode->OpcSetRawValue(Variant::Str("AUTO\r\n"), 0xC0, 0, false);
     EXPECT_EQ(document.ModeValue(), "Automatic");
     mode->OpcSetRawValue(Variant::Str("CAS"), 0xC0, 0, false);
@@ -141,7 +190,7 @@ TEST_F(TunFileDocument, CurrentChannelsFollowTheCurrentLoopAndModeNeedsItsChanne
     EXPECT_EQ(document.ModeValue(), "Unknown");
 }
 
-TEST_F(TunFileDocument, ReplacedCollectionsAreKeptAndNullIsIgnored) {
+TEST_F(TunFileDocument, ReplacedCollectionsAndSettingsAreKeptAndNullIsIgnored) {
     document.SetDefaults(9);
     auto archives = std::make_unique<ArchiveChannels>(tp.platform);
     ArchiveChannels* raw = archives.get();
@@ -152,6 +201,13 @@ TEST_F(TunFileDocument, ReplacedCollectionsAreKeptAndNullIsIgnored) {
     document.SetLoops(std::make_unique<LoopCollection>(tp.platform));
     document.SetLoops(nullptr);
     EXPECT_EQ(document.FaceplateLoop(), nullptr);
+    auto general = std::make_unique<TunFileGeneral>(tp.platform);
+    general->SetSIinSec(5);
+    TunFileGeneral* settings = general.get();
+    document.SetGeneral(std::move(general));
+    document.SetGeneral(nullptr);
+    EXPECT_EQ(std::tuple(&document.General(), document.General().SIinMSec()),
+              std::tuple(settings, 5000));
 }
 
 }  // namespace

@@ -1,9 +1,9 @@
 #include "document/TunerType.h"
 
-#include <gtest/gtest.h>
-
 #include <string>
 #include <tuple>
+
+#include <gtest/gtest.h>
 
 #include "support/TestPlatform.h"
 

@@ -1,6 +1,6 @@
-#include <gtest/gtest.h>
-
 #include <cmath>
+
+#include <gtest/gtest.h>
 
 #include "platform/Variant.h"
 #include "platform/fake/FixedLocale.h"
@@ -89,6 +89,10 @@ TEST(ChangeType, WritesNumbersWithTheRegionalDecimalSeparator) {
     EXPECT_EQ(Text(Variant::R8(-0.0)), "0");
     EXPECT_EQ(Text(Variant::R8(1e-300), kComma), "1E-300");
     EXPECT_EQ(Text(Variant::R8(INFINITY)), "Infinity");
+    // Exact binary ties round away from zero, as the automation library does.
+    EXPECT_EQ(Text(Variant::R4(654322.25F)), "654322.3");
+    EXPECT_EQ(Text(Variant::R4(-654322.25F), kComma), "-654322,3");
+    EXPECT_EQ(Text(Variant::R8(12345678901234.25)), "12345678901234.3");
 }
 
 TEST(ChangeType, ReadsNumbersWithTheRegionalSettings) {

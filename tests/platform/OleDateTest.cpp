@@ -1,8 +1,8 @@
 #include "platform/OleDate.h"
 
-#include <gtest/gtest.h>
-
 #include <cmath>
+
+#include <gtest/gtest.h>
 
 namespace cv {
 namespace {

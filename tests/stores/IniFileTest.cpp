@@ -71,6 +71,19 @@ TEST_F(IniFileTest, StringsKeepQuotedBlanksAndAreCutTo254Bytes) {
     ini_.WriteString("S", "long", std::string(300, 'z'));
     EXPECT_EQ(ini_.ReadString("S", "padded", ""), "  two blanks  ");
     EXPECT_EQ(ini_.ReadString("S", "long", ""), std::string(254, 'z'));
+    // Writing back what was read keeps the longer value; a change replaces it.
+    for (const bool bEncrypted : {false, true}) {
+        ini_.SetEncryptedFile(bEncrypted);
+        const std::string sLong = std::string(200, 'y') + std::string(100, 'w');
+        ini_.WriteString("S", "long", sLong);
+        const std::string sRead = ini_.ReadString("S", "long", "");
+        EXPECT_EQ(sRead.size(), bEncrypted ? 127u : 254u);
+        ini_.WriteString("S", "long", sRead);
+        ini_.WriteText("S", "long", sRead);
+        EXPECT_NE(Slurp().find(bEncrypted ? ini_.Encrypt(sLong) : sLong), std::string::npos);
+        ini_.WriteString("S", "long", std::string(sRead.size(), 'v'));
+        EXPECT_EQ(ini_.ReadString("S", "long", ""), std::string(sRead.size(), 'v'));
+    }
 }
 
 TEST_F(IniFileTest, ScramblesWithTheKeyedNibbleAlphabet) {

@@ -1,11 +1,11 @@
 #include "stores/InvariantNumber.h"
 
-#include <gtest/gtest.h>
-
 #include <clocale>
 #include <cmath>
 #include <limits>
 #include <random>
+
+#include <gtest/gtest.h>
 
 namespace cv {
 namespace {
@@ -26,6 +26,7 @@ TEST(InvariantNumber, WritesFifteenDigitsWithAPeriodAndNoLeadingZero) {
     EXPECT_EQ(InvariantText(-std::numeric_limits<double>::infinity()), "-1.79769313486232E+308");
     EXPECT_EQ(InvariantText(std::numeric_limits<double>::denorm_min()), "4.94065645841247E-324");
     EXPECT_EQ(InvariantText(std::nan("")), "NaN");
+    EXPECT_EQ(InvariantText(1234567890123.125), "1234567890123.13");  // ties away from zero
 }
 
 TEST(InvariantNumber, ReadsTheLongestNumericPrefixAndStaysFinite) {

@@ -1,8 +1,8 @@
 #include "stores/RegClass.h"
 
-#include <gtest/gtest.h>
-
 #include <set>
+
+#include <gtest/gtest.h>
 
 #include "platform/posix/FileRegistry.h"
 #include "support/TempFolder.h"

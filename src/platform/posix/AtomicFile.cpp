@@ -17,23 +17,42 @@ namespace {
 
 constexpr int kMaxLinkHops = 40;
 
-std::string FolderOf(const std::string& sPath) {
-    const auto slash = sPath.rfind('/');
+std::error_code LastError() {
+    return {errno, std::generic_category()};
+}
+
+std::error_code ErrorOf(std::errc code) {
+    return std::make_error_code(code);
+}
+
+// Repeats a call that a signal interrupted.
+template <typename Call>
+auto Retrying(Call call) {
+    for (;;) {
+        const auto result = call();
+        if (result >= 0 || errno != EINTR) {
+            return result;
+        }
+    }
+}
+
+std::string FolderOf(const std::string& path) {
+    const auto slash = path.rfind('/');
     if (slash == std::string::npos) {
         return ".";
     }
-    return slash == 0 ? "/" : sPath.substr(0, slash);
+    return slash == 0 ? "/" : path.substr(0, slash);
 }
 
-std::string NameOf(const std::string& sPath) {
-    const auto slash = sPath.rfind('/');
-    return slash == std::string::npos ? sPath : sPath.substr(slash + 1);
+std::string NameOf(const std::string& path) {
+    const auto slash = path.rfind('/');
+    return slash == std::string::npos ? path : path.substr(slash + 1);
 }
 
 // Follows symbolic links (dangling ones too) to the path that really holds
 // the file, so that replacing it keeps the links.
-std::string ResolveTarget(const std::string& sPath) {
-    std::string target = sPath;
+std::string ResolveTarget(const std::string& path) {
+    std::string target = path;
     for (int hop = 0; hop < kMaxLinkHops; ++hop) {
         struct stat info {};
         if (::lstat(target.c_str(), &info) != 0 || !S_ISLNK(info.st_mode)) {
@@ -50,64 +69,10 @@ std::string ResolveTarget(const std::string& sPath) {
     return target;
 }
 
-int ReadDescriptor(int iFd, std::string& sText) {
-    struct stat info {};
-    if (::fstat(iFd, &info) != 0) {
-        return errno;
-    }
-    if (S_ISDIR(info.st_mode)) {
-        return EISDIR;
-    }
-    std::string text;
-    text.reserve(static_cast<size_t>(std::clamp<int64_t>(info.st_size, 0, AtomicFile::kMaxBytes)));
-    std::array<char, 65536> block{};
-    for (;;) {
-        const ssize_t got = ::read(iFd, block.data(), block.size());
-        if (got < 0 && errno == EINTR) {
-            continue;
-        }
-        if (got < 0) {
-            return errno;
-        }
-        if (got == 0) {
-            break;
-        }
-        if (static_cast<int64_t>(text.size()) + got > AtomicFile::kMaxBytes) {
-            return EFBIG;
-        }
-        text.append(block.data(), static_cast<size_t>(got));
-    }
-    sText = std::move(text);
-    return 0;
-}
-
-int WriteAll(int iFd, std::string_view sText) {
-    while (!sText.empty()) {
-        const ssize_t put = ::write(iFd, sText.data(), sText.size());
-        if (put < 0 && errno == EINTR) {
-            continue;
-        }
-        if (put < 0) {
-            return errno;
-        }
-        sText.remove_prefix(static_cast<size_t>(put));
-    }
-    return 0;
-}
-
-// Makes a rename in the folder durable; file systems that cannot do this
-// still keep the rename atomic, so a failure here is not an error.
-void SyncFolder(const std::string& sFolder) {
-    const UniqueFd folder(::open(sFolder.c_str(), O_RDONLY | O_DIRECTORY | O_CLOEXEC));
-    if (folder.Valid()) {
-        ::fsync(folder.Get());
-    }
-}
-
-bool SameInode(int iFd, const std::string& sPath) {
+bool SameInode(int fd, const std::string& path) {
     struct stat held {};
     struct stat current {};
-    return ::fstat(iFd, &held) == 0 && ::stat(sPath.c_str(), &current) == 0 &&
+    return ::fstat(fd, &held) == 0 && ::stat(path.c_str(), &current) == 0 &&
            held.st_dev == current.st_dev && held.st_ino == current.st_ino;
 }
 
@@ -122,146 +87,208 @@ std::string TimeTag() {
 
 }  // namespace
 
-AtomicFile::AtomicFile(std::string sPath, NewFileMode eNewMode)
-    : msPath(std::move(sPath)), meNewMode(eNewMode) {}
+AtomicFile::AtomicFile(std::string path, NewFileMode newMode, SystemCalls& calls)
+    : path_(std::move(path)), newMode_(newMode), calls_(calls) {}
 
 AtomicFile::~AtomicFile() {
     Unlock();
 }
 
+int AtomicFile::Open(const std::string& path, int flags, mode_t mode) const {
+    return Retrying([&] { return calls_.Open(path.c_str(), flags, mode); });
+}
+
+std::error_code AtomicFile::ReadAll(int fd, std::string& out) const {
+    struct stat info {};
+    if (::fstat(fd, &info) != 0) {
+        return LastError();
+    }
+    if (S_ISDIR(info.st_mode)) {
+        return ErrorOf(std::errc::is_a_directory);
+    }
+    std::string text;
+    text.reserve(static_cast<size_t>(std::clamp<int64_t>(info.st_size, 0, kMaxBytes)));
+    std::array<char, 65536> block{};
+    for (;;) {
+        const ssize_t got = Retrying([&] { return calls_.Read(fd, block.data(), block.size()); });
+        if (got < 0) {
+            return LastError();
+        }
+        if (got == 0) {
+            break;
+        }
+        if (static_cast<int64_t>(text.size()) + got > kMaxBytes) {
+            return ErrorOf(std::errc::file_too_large);
+        }
+        text.append(block.data(), static_cast<size_t>(got));
+    }
+    out = std::move(text);
+    return {};
+}
+
+std::error_code AtomicFile::WriteAll(int fd, std::string_view text) const {
+    while (!text.empty()) {
+        const ssize_t put = Retrying([&] { return calls_.Write(fd, text.data(), text.size()); });
+        if (put < 0) {
+            return LastError();
+        }
+        text.remove_prefix(static_cast<size_t>(put));
+    }
+    return {};
+}
+
+std::error_code AtomicFile::Sync(int fd) const {
+    return Retrying([&] { return calls_.Fsync(fd); }) != 0 ? LastError() : std::error_code();
+}
+
+// Makes a rename in the folder durable; file systems that cannot do this
+// still keep the rename atomic, so a failure here is not an error.
+void AtomicFile::SyncFolder(const std::string& folder) const {
+    const UniqueFd handle(Open(folder, O_RDONLY | O_DIRECTORY | O_CLOEXEC));
+    if (handle.Valid()) {
+        static_cast<void>(Sync(handle.Get()));
+    }
+}
+
 FileRead AtomicFile::Read() const {
     FileRead result;
-    const std::string& path = Locked() ? msLockedTarget : msPath;
-    auto file = std::make_shared<UniqueFd>(::open(path.c_str(), O_RDONLY | O_CLOEXEC | O_NOCTTY));
+    const std::string& path = Locked() ? lockedTarget_ : path_;
+    auto file = std::make_shared<UniqueFd>(Open(path, O_RDONLY | O_CLOEXEC | O_NOCTTY));
     if (!file->Valid()) {
-        result.Error = errno;
-        const bool missing = result.Error == ENOENT || result.Error == ENOTDIR;
-        result.Status = missing ? ReadStatus::Missing : ReadStatus::Unreadable;
+        result.error = LastError();
+        const bool missing = result.error == std::errc::no_such_file_or_directory ||
+                             result.error == std::errc::not_a_directory;
+        result.status = missing ? ReadStatus::Missing : ReadStatus::Unreadable;
         return result;
     }
     struct stat info {};
-    result.Error =
-        ::fstat(file->Get(), &info) == 0 ? ReadDescriptor(file->Get(), result.Text) : errno;
-    if (result.Error != 0) {
-        result.Status = ReadStatus::Unreadable;
-        result.Text.clear();
+    result.error =
+        ::fstat(file->Get(), &info) == 0 ? ReadAll(file->Get(), result.text) : LastError();
+    if (result.error) {
+        result.status = ReadStatus::Unreadable;
+        result.text.clear();
         return result;
     }
-    result.Status = ReadStatus::Read;
-    result.Stamp = FileStamp::OfStat(info, std::move(file));
+    result.status = ReadStatus::Read;
+    result.stamp = FileStamp::OfStat(info, std::move(file));
     return result;
 }
 
 FileStamp AtomicFile::Stamp() const {
     if (!Locked()) {
-        return FileStamp::OfPath(msPath);
+        return FileStamp::OfPath(path_);
     }
-    auto pin =
-        std::make_shared<UniqueFd>(::open(msLockedTarget.c_str(), O_RDONLY | O_CLOEXEC | O_NOCTTY));
+    auto pin = std::make_shared<UniqueFd>(Open(lockedTarget_, O_RDONLY | O_CLOEXEC | O_NOCTTY));
     struct stat info {};
     if (!pin->Valid() || ::fstat(pin->Get(), &info) != 0) {
-        return FileStamp::OfPath(msLockedTarget);
+        return FileStamp::OfPath(lockedTarget_);
     }
     return FileStamp::OfStat(info, std::move(pin));
 }
 
-int AtomicFile::Lock() {
+std::error_code AtomicFile::Lock() {
     if (Locked()) {
-        return 0;
+        return {};
     }
-    return LockTarget(ResolveTarget(msPath));
+    return LockTarget(ResolveTarget(path_));
 }
 
-int AtomicFile::LockTarget(const std::string& sTarget) {
+std::error_code AtomicFile::LockTarget(const std::string& target) {
     const auto deadline = std::chrono::steady_clock::now() + std::chrono::milliseconds(kLockWaitMs);
     for (;;) {
         UniqueFd file;
-        const int error = OpenForLock(sTarget, file);
-        if (error != 0) {
+        if (const std::error_code error = OpenForLock(target, file)) {
             return error;
         }
         int pauseMs = 1;
-        while (::flock(file.Get(), LOCK_EX | LOCK_NB) != 0) {
-            if (errno == EINTR) {
-                continue;
-            }
+        while (Retrying([&] { return calls_.Flock(file.Get(), LOCK_EX | LOCK_NB); }) != 0) {
             if (errno != EWOULDBLOCK) {
-                return errno;
+                const std::error_code error = LastError();
+                Abandon(file, target);
+                return error;
             }
             if (std::chrono::steady_clock::now() >= deadline) {
-                return ETIMEDOUT;
+                Abandon(file, target);
+                return ErrorOf(std::errc::timed_out);
             }
             std::this_thread::sleep_for(std::chrono::milliseconds(pauseMs));
             pauseMs = std::min(pauseMs * 2, 50);
         }
-        if (SameInode(file.Get(), sTarget)) {
-            mcLock = std::move(file);
-            msLockedTarget = sTarget;
-            return 0;
+        if (SameInode(file.Get(), target)) {
+            lock_ = std::move(file);
+            lockedTarget_ = target;
+            return {};
         }
     }
 }
 
-int AtomicFile::OpenForLock(const std::string& sTarget, UniqueFd& cFd) {
-    const mode_t mode = meNewMode == NewFileMode::OwnerOnly ? 0600 : 0666;
+// A file created empty only to be locked goes again when nothing was
+// written to it.
+void AtomicFile::Abandon(UniqueFd& file, const std::string& target) {
+    struct stat info {};
+    if (createdEmpty_ && ::fstat(file.Get(), &info) == 0 && info.st_size == 0 &&
+        SameInode(file.Get(), target)) {
+        ::unlink(target.c_str());
+    }
+    file.Reset();
+    createdEmpty_ = false;
+}
+
+std::error_code AtomicFile::OpenForLock(const std::string& target, UniqueFd& fd) {
+    const mode_t mode = newMode_ == NewFileMode::OwnerOnly ? 0600 : 0666;
     for (;;) {
-        cFd.Reset(::open(sTarget.c_str(), O_RDONLY | O_CLOEXEC | O_NOCTTY));
-        if (cFd.Valid()) {
-            mbCreatedEmpty = false;
+        fd.Reset(Open(target, O_RDONLY | O_CLOEXEC | O_NOCTTY));
+        if (fd.Valid()) {
+            createdEmpty_ = false;
             struct stat info {};
-            return ::fstat(cFd.Get(), &info) != 0 ? errno : S_ISDIR(info.st_mode) ? EISDIR : 0;
+            if (::fstat(fd.Get(), &info) != 0) {
+                return LastError();
+            }
+            return S_ISDIR(info.st_mode) ? ErrorOf(std::errc::is_a_directory) : std::error_code();
         }
         if (errno != ENOENT) {
-            return errno;
+            return LastError();
         }
-        cFd.Reset(
-            ::open(sTarget.c_str(), O_RDONLY | O_CREAT | O_EXCL | O_CLOEXEC | O_NOCTTY, mode));
-        if (cFd.Valid()) {
-            mbCreatedEmpty = true;
-            return 0;
+        fd.Reset(Open(target, O_RDONLY | O_CREAT | O_EXCL | O_CLOEXEC | O_NOCTTY, mode));
+        if (fd.Valid()) {
+            createdEmpty_ = true;
+            return {};
         }
         if (errno != EEXIST) {
-            return errno;
+            return LastError();
         }
     }
 }
 
 void AtomicFile::Unlock() {
-    if (!Locked()) {
-        return;
+    if (Locked()) {
+        Abandon(lock_, lockedTarget_);
+        lockedTarget_.clear();
     }
-    struct stat info {};
-    if (mbCreatedEmpty && ::fstat(mcLock.Get(), &info) == 0 && info.st_size == 0 &&
-        SameInode(mcLock.Get(), msLockedTarget)) {
-        ::unlink(msLockedTarget.c_str());
-    }
-    mcLock.Reset();
-    msLockedTarget.clear();
-    mbCreatedEmpty = false;
 }
 
-int AtomicFile::Replace(std::string_view sText) {
+std::error_code AtomicFile::Replace(std::string_view text) {
     const bool ownLock = !Locked();
-    int error = Lock();
-    if (error != 0) {
+    std::error_code error = Lock();
+    if (error) {
         return error;
     }
     UniqueFd temp;
     std::string tempPath;
-    if (::access(msLockedTarget.c_str(), W_OK) != 0) {
-        error = errno;
+    if (::access(lockedTarget_.c_str(), W_OK) != 0) {
+        error = LastError();
     } else {
-        error = WriteTemporary(sText, temp, tempPath);
+        error = WriteTemporary(text, temp, tempPath);
     }
-    if (error == 0 && (::flock(temp.Get(), LOCK_EX | LOCK_NB) != 0 ||
-                       ::rename(tempPath.c_str(), msLockedTarget.c_str()) != 0)) {
-        error = errno;
+    if (!error && (Retrying([&] { return calls_.Flock(temp.Get(), LOCK_EX | LOCK_NB); }) != 0 ||
+                   calls_.Rename(tempPath.c_str(), lockedTarget_.c_str()) != 0)) {
+        error = LastError();
         ::unlink(tempPath.c_str());
     }
-    if (error == 0) {
-        SyncFolder(FolderOf(msLockedTarget));
-        mcLock = std::move(temp);
-        mbCreatedEmpty = false;
+    if (!error) {
+        SyncFolder(FolderOf(lockedTarget_));
+        lock_ = std::move(temp);
+        createdEmpty_ = false;
     }
     if (ownLock) {
         Unlock();
@@ -269,50 +296,51 @@ int AtomicFile::Replace(std::string_view sText) {
     return error;
 }
 
-int AtomicFile::WriteTemporary(std::string_view sText, UniqueFd& cTemp,
-                               std::string& sTempPath) const {
-    sTempPath = FolderOf(msLockedTarget) + "/." + NameOf(msLockedTarget) + ".cv-tmp";
-    ::unlink(sTempPath.c_str());
-    cTemp.Reset(
-        ::open(sTempPath.c_str(), O_RDWR | O_CREAT | O_EXCL | O_NOFOLLOW | O_CLOEXEC, 0600));
-    if (!cTemp.Valid()) {
-        return errno;
+std::error_code AtomicFile::WriteTemporary(std::string_view text, UniqueFd& temp,
+                                           std::string& tempPath) const {
+    tempPath = FolderOf(lockedTarget_) + "/." + NameOf(lockedTarget_) + ".cv-tmp";
+    ::unlink(tempPath.c_str());
+    temp.Reset(Open(tempPath, O_RDWR | O_CREAT | O_EXCL | O_NOFOLLOW | O_CLOEXEC, 0600));
+    if (!temp.Valid()) {
+        return LastError();
     }
     struct stat held {};
-    int error = ::fstat(mcLock.Get(), &held) != 0 ? errno : 0;
-    if (error == 0 && ::fchmod(cTemp.Get(), held.st_mode & 07777) != 0) {
-        error = errno;
+    std::error_code error = ::fstat(lock_.Get(), &held) != 0 ? LastError() : std::error_code();
+    if (!error && ::fchmod(temp.Get(), held.st_mode & 07777) != 0) {
+        error = LastError();
     }
-    if (error == 0) {
-        error = WriteAll(cTemp.Get(), sText);
+    if (!error) {
+        error = WriteAll(temp.Get(), text);
     }
-    if (error == 0 && ::fsync(cTemp.Get()) != 0) {
-        error = errno;
+    if (!error) {
+        error = Sync(temp.Get());
     }
-    if (error != 0) {
-        cTemp.Reset();
-        ::unlink(sTempPath.c_str());
+    if (error) {
+        temp.Reset();
+        ::unlink(tempPath.c_str());
     }
     return error;
 }
 
-int AtomicFile::SetAside(std::string& sAsidePath) {
+std::error_code AtomicFile::SetAside(std::string& asidePath) {
     const bool ownLock = !Locked();
-    int error = Lock();
-    if (error != 0) {
+    std::error_code error = Lock();
+    if (error) {
         return error;
     }
     const FileRead current = Read();
-    error = current.Status == ReadStatus::Read ? 0 : current.Error;
-    const std::string base = msLockedTarget + ".damaged-" + TimeTag();
-    for (int attempt = 1; error == 0; ++attempt) {
+    error = current.status == ReadStatus::Read ? std::error_code() : current.error;
+    const std::string base = lockedTarget_ + ".damaged-" + TimeTag();
+    for (int attempt = 1; !error; ++attempt) {
         const std::string candidate = attempt == 1 ? base : base + "-" + std::to_string(attempt);
-        error = CopyTo(current.Text, candidate);
-        if (error == 0) {
-            sAsidePath = candidate;
+        error = CopyTo(current.text, candidate);
+        if (!error) {
+            asidePath = candidate;
             break;
         }
-        error = error == EEXIST && attempt < 1000 ? 0 : error;
+        if (error == std::errc::file_exists && attempt < 1000) {
+            error.clear();
+        }
     }
     if (ownLock) {
         Unlock();
@@ -320,36 +348,36 @@ int AtomicFile::SetAside(std::string& sAsidePath) {
     return error;
 }
 
-int AtomicFile::CopyTo(const std::string& sText, const std::string& sAsidePath) const {
-    const UniqueFd copy(::open(sAsidePath.c_str(), O_WRONLY | O_CREAT | O_EXCL | O_CLOEXEC, 0600));
+std::error_code AtomicFile::CopyTo(const std::string& text, const std::string& asidePath) const {
+    const UniqueFd copy(Open(asidePath, O_WRONLY | O_CREAT | O_EXCL | O_CLOEXEC, 0600));
     if (!copy.Valid()) {
-        return errno;
+        return LastError();
     }
-    int error = WriteAll(copy.Get(), sText);
-    if (error == 0 && ::fsync(copy.Get()) != 0) {
-        error = errno;
+    std::error_code error = WriteAll(copy.Get(), text);
+    if (!error) {
+        error = Sync(copy.Get());
     }
-    if (error != 0) {
-        ::unlink(sAsidePath.c_str());
+    if (error) {
+        ::unlink(asidePath.c_str());
     }
     return error;
 }
 
-int AtomicFile::MakeFolders(const std::string& sFolder) {
-    for (size_t slash = sFolder.find('/', 1);; slash = sFolder.find('/', slash + 1)) {
-        const std::string prefix = sFolder.substr(0, slash);
+std::error_code AtomicFile::MakeFolders(const std::string& folder) {
+    for (size_t slash = folder.find('/', 1);; slash = folder.find('/', slash + 1)) {
+        const std::string prefix = folder.substr(0, slash);
         if (!prefix.empty() && ::mkdir(prefix.c_str(), 0700) != 0 && errno != EEXIST) {
-            return errno;
+            return LastError();
         }
         if (slash == std::string::npos) {
             break;
         }
     }
     struct stat info {};
-    if (::stat(sFolder.c_str(), &info) != 0) {
-        return errno;
+    if (::stat(folder.c_str(), &info) != 0) {
+        return LastError();
     }
-    return S_ISDIR(info.st_mode) ? 0 : ENOTDIR;
+    return S_ISDIR(info.st_mode) ? std::error_code() : ErrorOf(std::errc::not_a_directory);
 }
 
 }  // namespace cv::posix

@@ -3,8 +3,10 @@
 #include <cstdint>
 #include <string>
 #include <string_view>
+#include <system_error>
 
 #include "platform/posix/FileStamp.h"
+#include "platform/posix/SystemCalls.h"
 #include "platform/posix/UniqueFd.h"
 
 namespace cv::posix {
@@ -22,10 +24,10 @@ enum class NewFileMode {
 };
 
 struct FileRead {
-    ReadStatus Status = ReadStatus::Missing;
-    std::string Text;
-    FileStamp Stamp;  // of the version read; missing unless Status is Read
-    int Error = 0;    // errno behind Unreadable
+    ReadStatus status = ReadStatus::Missing;
+    std::string text;
+    FileStamp stamp;        // of the version read; missing unless status is Read
+    std::error_code error;  // the system's reason for Unreadable
 };
 
 // One file that is only ever replaced whole, never torn, and whose
@@ -47,7 +49,11 @@ struct FileRead {
 // left by a crash is simply overwritten by the next writer. Locks are per
 // object: two objects of one process on the same file exclude each other too.
 //
-// Every result is an errno value, 0 for success; nothing throws.
+// Failures: every result is the system's error code (generic category), empty
+// for success; nothing throws. A failed Replace leaves the old file as it was
+// and no temporary file behind, and releases a lock it took. Interrupted
+// calls (EINTR) are repeated and short writes continued. All disk access goes
+// through the SystemCalls given, so tests can make any call fail.
 class AtomicFile {
   public:
     // Files larger than this are not read (Unreadable, EFBIG).
@@ -55,47 +61,56 @@ class AtomicFile {
     // How long Lock waits for another holder before giving up with ETIMEDOUT.
     static constexpr int kLockWaitMs = 10000;
 
-    explicit AtomicFile(std::string sPath, NewFileMode eNewMode = NewFileMode::OwnerOnly);
+    explicit AtomicFile(std::string path, NewFileMode newMode = NewFileMode::OwnerOnly,
+                        SystemCalls& calls = SystemCalls::Real());
     ~AtomicFile();
     AtomicFile(const AtomicFile&) = delete;
     AtomicFile& operator=(const AtomicFile&) = delete;
 
-    const std::string& Path() const { return msPath; }
+    const std::string& Path() const { return path_; }
 
     // The whole file. Needs no lock: writers only ever rename whole files in.
     // While this object holds the lock, reads the locked version.
-    FileRead Read() const;
+    [[nodiscard]] FileRead Read() const;
     // The current version's stamp, without reading (one stat). While this
     // object holds the lock: the locked version's stamp, which keeps that
     // version's inode pinned like a stamp from Read.
-    FileStamp Stamp() const;
+    [[nodiscard]] FileStamp Stamp() const;
 
-    int Lock();
+    [[nodiscard]] std::error_code Lock();
     void Unlock();
-    bool Locked() const { return mcLock.Valid(); }
+    bool Locked() const { return lock_.Valid(); }
 
-    // Puts sText in place atomically. Takes the lock for the call when not
+    // Puts text in place atomically. Takes the lock for the call when not
     // held. Refuses (EACCES) a file the user has made read-only.
-    int Replace(std::string_view sText);
+    [[nodiscard]] std::error_code Replace(std::string_view text);
     // Keeps a copy of the current file as "<path>.damaged-YYYYMMDD-HHMMSS"
     // (with "-2", "-3", ... when taken), so that a following Replace cannot
-    // lose it; sAsidePath receives the copy's path.
-    int SetAside(std::string& sAsidePath);
+    // lose it; asidePath receives the copy's path.
+    [[nodiscard]] std::error_code SetAside(std::string& asidePath);
 
-    // Creates sFolder and its missing parents with mode 0700.
-    static int MakeFolders(const std::string& sFolder);
+    // Creates folder and its missing parents with mode 0700.
+    [[nodiscard]] static std::error_code MakeFolders(const std::string& folder);
 
   private:
-    int LockTarget(const std::string& sTarget);
-    int OpenForLock(const std::string& sTarget, UniqueFd& cFd);
-    int WriteTemporary(std::string_view sText, UniqueFd& cTemp, std::string& sTempPath) const;
-    int CopyTo(const std::string& sText, const std::string& sAsidePath) const;
+    std::error_code LockTarget(const std::string& target);
+    std::error_code OpenForLock(const std::string& target, UniqueFd& fd);
+    std::error_code WriteTemporary(std::string_view text, UniqueFd& temp,
+                                   std::string& tempPath) const;
+    std::error_code CopyTo(const std::string& text, const std::string& asidePath) const;
+    void Abandon(UniqueFd& file, const std::string& target);
+    int Open(const std::string& path, int flags, mode_t mode = 0) const;
+    std::error_code ReadAll(int fd, std::string& out) const;
+    std::error_code WriteAll(int fd, std::string_view text) const;
+    std::error_code Sync(int fd) const;
+    void SyncFolder(const std::string& folder) const;
 
-    std::string msPath;
-    NewFileMode meNewMode;
-    UniqueFd mcLock;
-    std::string msLockedTarget;
-    bool mbCreatedEmpty = false;
+    std::string path_;
+    NewFileMode newMode_;
+    SystemCalls& calls_;
+    UniqueFd lock_;
+    std::string lockedTarget_;
+    bool createdEmpty_ = false;
 };
 
 }  // namespace cv::posix

@@ -7,106 +7,109 @@ namespace cv::posix {
 namespace {
 
 // The text a C string argument would carry: up to its first NUL.
-std::string CString(const std::string& sText) {
-    return sText.substr(0, sText.find('\0'));
+std::string CString(const std::string& text) {
+    return text.substr(0, text.find('\0'));
 }
 
-std::optional<std::string> CString(const std::optional<std::string>& sText) {
-    return sText ? std::optional<std::string>(CString(*sText)) : std::nullopt;
+std::optional<std::string> CString(const std::optional<std::string>& text) {
+    return text ? std::optional<std::string>(CString(*text)) : std::nullopt;
 }
 
-bool IsUtf16(const std::string& sText) {
-    return sText.starts_with("\xFF\xFE") || sText.starts_with("\xFE\xFF");
+bool IsUtf16(const std::string& text) {
+    return text.starts_with("\xFF\xFE") || text.starts_with("\xFE\xFF");
 }
 
-std::string WithoutTrailingBlanks(std::string sText) {
-    sText.erase(sText.find_last_not_of(" \t") + 1);
-    return sText;
+std::string WithoutTrailingBlanks(std::string text) {
+    text.erase(text.find_last_not_of(" \t") + 1);
+    return text;
 }
 
 }  // namespace
 
-FileProfiles::FileProfiles(std::string sConfigFolder) : msConfigFolder(std::move(sConfigFolder)) {}
+FileProfiles::FileProfiles(std::string configFolder, SystemCalls& calls)
+    : configFolder_(std::move(configFolder)), calls_(calls) {}
 
-FileProfiles::Profile* FileProfiles::Open(const std::string& sFileName) {
-    const std::string path = ProfilePath(CString(sFileName), msConfigFolder);
+FileProfiles::Profile* FileProfiles::Open(const std::string& fileName) {
+    const std::string path = ProfilePath(CString(fileName), configFolder_);
     if (path.empty()) {
         return nullptr;
     }
-    const auto found = mcProfiles.find(path);
-    if (found != mcProfiles.end()) {
+    const auto found = profiles_.find(path);
+    if (found != profiles_.end()) {
         return &found->second;
     }
-    const bool settings = IsInConfigFolder(path, msConfigFolder);
+    const bool settings = IsInConfigFolder(path, configFolder_);
     Profile& profile =
-        mcProfiles
-            .try_emplace(path, path, settings ? NewFileMode::OwnerOnly : NewFileMode::UmaskDefault)
+        profiles_
+            .try_emplace(path, path, settings ? NewFileMode::OwnerOnly : NewFileMode::UmaskDefault,
+                         calls_)
             .first->second;
     profile.inConfigFolder = settings;
     return &profile;
 }
 
-void FileProfiles::Load(Profile& cProfile) {
-    if (!cProfile.loaded || !(cProfile.file.Stamp() == cProfile.stamp)) {
-        Reload(cProfile);
+void FileProfiles::Load(Profile& profile) {
+    if (!profile.loaded || !(profile.file.Stamp() == profile.stamp)) {
+        Reload(profile);
     }
 }
 
-void FileProfiles::Reload(Profile& cProfile) {
-    FileRead read = cProfile.file.Read();
-    cProfile.status = read.Status;
-    cProfile.stamp = std::move(read.Stamp);
-    cProfile.foreign = read.Status == ReadStatus::Read && IsUtf16(read.Text);
-    const bool usable = read.Status == ReadStatus::Read && !cProfile.foreign;
-    cProfile.document = usable ? IniDocument::Parse(read.Text) : IniDocument();
-    cProfile.dirty = false;
-    for (const Edit& edit : cProfile.pending) {
-        cProfile.dirty = Apply(cProfile.document, edit) || cProfile.dirty;
+void FileProfiles::Reload(Profile& profile) {
+    FileRead read = profile.file.Read();
+    profile.status = read.status;
+    profile.stamp = std::move(read.stamp);
+    profile.foreign = read.status == ReadStatus::Read && IsUtf16(read.text);
+    const bool usable = read.status == ReadStatus::Read && !profile.foreign;
+    profile.document = usable ? IniDocument::Parse(read.text) : IniDocument();
+    profile.dirty = false;
+    for (const Edit& edit : profile.pending) {
+        profile.dirty = Apply(profile.document, edit) || profile.dirty;
     }
-    cProfile.loaded = true;
+    profile.loaded = true;
 }
 
-bool FileProfiles::Apply(IniDocument& cDocument, const Edit& tEdit) {
-    if (!tEdit.key) {
-        return cDocument.EraseSection(tEdit.section);
+bool FileProfiles::Apply(IniDocument& document, const Edit& edit) {
+    if (!edit.key) {
+        return document.EraseSection(edit.section);
     }
-    if (!tEdit.value) {
-        return cDocument.EraseKey(tEdit.section, *tEdit.key);
+    if (!edit.value) {
+        return document.EraseKey(edit.section, *edit.key);
     }
-    return cDocument.SetValue(tEdit.section, *tEdit.key, *tEdit.value);
+    return document.SetValue(edit.section, *edit.key, *edit.value);
 }
 
-std::string FileProfiles::GetPrivateProfileString(const std::string& sSection,
-                                                  const std::string& sKey,
-                                                  const std::string& sDefault, int32_t lBufferSize,
-                                                  const std::string& sFileName) {
-    if (lBufferSize <= 0) {
+std::string FileProfiles::GetPrivateProfileString(const std::string& section,
+                                                  const std::string& key,
+                                                  const std::string& defaultValue,
+                                                  int32_t bufferSize, const std::string& fileName) {
+    if (bufferSize <= 0) {
         return {};
     }
     std::optional<std::string> value;
-    if (Profile* profile = Open(sFileName)) {
+    if (Profile* profile = Open(fileName)) {
         Load(*profile);
-        value = profile->document.Value(CString(sSection), CString(sKey));
+        value = profile->document.Value(CString(section), CString(key));
     }
-    std::string result = value ? std::move(*value) : WithoutTrailingBlanks(CString(sDefault));
-    if (result.size() >= static_cast<size_t>(lBufferSize)) {
-        result.resize(static_cast<size_t>(lBufferSize) - 1);
+    std::string result = value ? std::move(*value) : WithoutTrailingBlanks(CString(defaultValue));
+    if (result.size() >= static_cast<size_t>(bufferSize)) {
+        result.resize(static_cast<size_t>(bufferSize) - 1);
     }
     return result;
 }
 
-bool FileProfiles::WritePrivateProfileString(const std::string& sSection,
-                                             const std::optional<std::string>& sKey,
-                                             const std::optional<std::string>& sValue,
-                                             const std::string& sFileName) {
-    Edit edit{CString(sSection), CString(sKey), sKey ? CString(sValue) : std::nullopt};
+bool FileProfiles::WritePrivateProfileString(const std::string& section,
+                                             const std::optional<std::string>& key,
+                                             const std::optional<std::string>& value,
+                                             const std::string& fileName) {
+    Edit edit{CString(section), CString(key), key ? CString(value) : std::nullopt};
+    Profile* profile = Open(fileName);
+    if (profile == nullptr) {
+        return false;
+    }
     if (!IniDocument::IsSectionName(edit.section) ||
         (edit.key && !IniDocument::IsKeyName(*edit.key)) ||
         (edit.value && !IniDocument::IsValueText(*edit.value))) {
-        return false;
-    }
-    Profile* profile = Open(sFileName);
-    if (profile == nullptr) {
+        profile->refused = profile->refused || profile->batchDepth > 0;
         return false;
     }
     if (profile->batchDepth == 0) {
@@ -118,64 +121,76 @@ bool FileProfiles::WritePrivateProfileString(const std::string& sSection,
     return true;
 }
 
-void FileProfiles::BeginBatch(const std::string& sFileName) {
-    if (Profile* profile = Open(sFileName)) {
+bool FileProfiles::FileReadable(const std::string& fileName) {
+    Profile* profile = Open(fileName);
+    if (profile == nullptr) {
+        return false;
+    }
+    Load(*profile);
+    return profile->status == ReadStatus::Read;
+}
+
+void FileProfiles::BeginBatch(const std::string& fileName) {
+    if (Profile* profile = Open(fileName)) {
         ++profile->batchDepth;
     }
 }
 
-bool FileProfiles::EndBatch(const std::string& sFileName) {
-    Profile* profile = Open(sFileName);
+bool FileProfiles::EndBatch(const std::string& fileName) {
+    Profile* profile = Open(fileName);
     if (profile == nullptr || profile->batchDepth == 0) {
         return false;
     }
     if (--profile->batchDepth > 0) {
         return true;
     }
-    const bool stored = profile->pending.empty() || Store(*profile, nullptr);
+    // A batch whose writes were not all taken stores none of them.
+    const bool stored = !profile->refused && (profile->pending.empty() || Store(*profile, nullptr));
+    profile->loaded = profile->loaded && !profile->refused;
     profile->pending.clear();
     profile->dirty = false;
+    profile->refused = false;
     return stored;
 }
 
-bool FileProfiles::Store(Profile& cProfile, const Edit* pEdit) {
-    if (cProfile.inConfigFolder && AtomicFile::MakeFolders(msConfigFolder) != 0) {
+bool FileProfiles::Store(Profile& profile, const Edit* edit) {
+    if (profile.inConfigFolder && AtomicFile::MakeFolders(configFolder_)) {
         return false;
     }
-    if (cProfile.file.Lock() != 0) {
+    if (profile.file.Lock()) {
         return false;
     }
-    const bool stored = StoreLocked(cProfile, pEdit);
-    cProfile.file.Unlock();
+    const bool stored = StoreLocked(profile, edit);
+    profile.file.Unlock();
     if (!stored) {
-        cProfile.loaded = false;
+        profile.loaded = false;
     }
     return stored;
 }
 
-bool FileProfiles::StoreLocked(Profile& cProfile, const Edit* pEdit) {
-    Load(cProfile);
-    if (cProfile.status == ReadStatus::Unreadable) {
+bool FileProfiles::StoreLocked(Profile& profile, const Edit* edit) {
+    Load(profile);
+    if (profile.status == ReadStatus::Unreadable) {
         return false;
     }
-    const bool changed = pEdit != nullptr ? Apply(cProfile.document, *pEdit) : cProfile.dirty;
+    const bool changed = edit != nullptr ? Apply(profile.document, *edit) : profile.dirty;
     if (!changed) {
         return true;
     }
     std::string aside;
-    if (cProfile.foreign && cProfile.file.SetAside(aside) != 0) {
+    if (profile.foreign && profile.file.SetAside(aside)) {
         return false;
     }
-    if (cProfile.file.Replace(cProfile.document.Serialise()) != 0) {
+    if (profile.file.Replace(profile.document.Serialise())) {
         return false;
     }
     // The document now matches the file; a read under the lock gives the
     // stamp that pins the version written.
-    FileRead written = cProfile.file.Read();
-    cProfile.status = written.Status;
-    cProfile.stamp = std::move(written.Stamp);
-    cProfile.foreign = false;
-    cProfile.dirty = false;
+    FileRead written = profile.file.Read();
+    profile.status = written.status;
+    profile.stamp = std::move(written.stamp);
+    profile.foreign = false;
+    profile.dirty = false;
     return true;
 }
 

@@ -48,17 +48,20 @@ namespace cv::posix {
 // Window thread only.
 class FileProfiles : public platform::ProfileApi {
   public:
-    explicit FileProfiles(std::string sConfigFolder = ConfigFolder());
+    // Files are reached through calls (tests make them fail).
+    explicit FileProfiles(std::string configFolder = ConfigFolder(),
+                          SystemCalls& calls = SystemCalls::Real());
 
-    std::string GetPrivateProfileString(const std::string& sSection, const std::string& sKey,
-                                        const std::string& sDefault, int32_t lBufferSize,
-                                        const std::string& sFileName) override;
-    bool WritePrivateProfileString(const std::string& sSection,
-                                   const std::optional<std::string>& sKey,
-                                   const std::optional<std::string>& sValue,
-                                   const std::string& sFileName) override;
-    void BeginBatch(const std::string& sFileName) override;
-    bool EndBatch(const std::string& sFileName) override;
+    std::string GetPrivateProfileString(const std::string& section, const std::string& key,
+                                        const std::string& defaultValue, int32_t bufferSize,
+                                        const std::string& fileName) override;
+    bool WritePrivateProfileString(const std::string& section,
+                                   const std::optional<std::string>& key,
+                                   const std::optional<std::string>& value,
+                                   const std::string& fileName) override;
+    bool FileReadable(const std::string& fileName) override;
+    void BeginBatch(const std::string& fileName) override;
+    bool EndBatch(const std::string& fileName) override;
 
   private:
     // One write: no key erases the section, no value erases the key.
@@ -69,7 +72,8 @@ class FileProfiles : public platform::ProfileApi {
     };
 
     struct Profile {
-        Profile(std::string sPath, NewFileMode eMode) : file(std::move(sPath), eMode) {}
+        Profile(std::string path, NewFileMode mode, SystemCalls& calls)
+            : file(std::move(path), mode, calls) {}
 
         AtomicFile file;
         bool inConfigFolder = false;
@@ -83,18 +87,21 @@ class FileProfiles : public platform::ProfileApi {
         std::vector<Edit> pending;
         // Whether pending changed the document.
         bool dirty = false;
+        // Whether the batch refused a write.
+        bool refused = false;
     };
 
-    Profile* Open(const std::string& sFileName);
-    void Load(Profile& cProfile);
-    void Reload(Profile& cProfile);
-    bool Store(Profile& cProfile, const Edit* pEdit);
-    bool StoreLocked(Profile& cProfile, const Edit* pEdit);
-    static bool Apply(IniDocument& cDocument, const Edit& tEdit);
+    Profile* Open(const std::string& fileName);
+    void Load(Profile& profile);
+    void Reload(Profile& profile);
+    bool Store(Profile& profile, const Edit* edit);
+    bool StoreLocked(Profile& profile, const Edit* edit);
+    static bool Apply(IniDocument& document, const Edit& edit);
 
-    std::string msConfigFolder;
+    std::string configFolder_;
+    SystemCalls& calls_;
     // By resolved path.
-    std::unordered_map<std::string, Profile> mcProfiles;
+    std::unordered_map<std::string, Profile> profiles_;
 };
 
 }  // namespace cv::posix

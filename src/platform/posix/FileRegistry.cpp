@@ -12,10 +12,12 @@ namespace {
 
 using namespace platform;
 
-int32_t RegistryCode(int iErrno) {
-    switch (iErrno) {
-        case 0:
-            return kErrorSuccess;
+// The registry's code for a file error (all of the generic category).
+int32_t RegistryCode(const std::error_code& error) {
+    if (!error) {
+        return kErrorSuccess;
+    }
+    switch (error.value()) {
         case EACCES:
         case EPERM:
         case EROFS:
@@ -28,222 +30,220 @@ int32_t RegistryCode(int iErrno) {
     }
 }
 
-bool WantsWrite(int32_t lAccess) {
-    return (lAccess & (kKeySetValue | kKeyCreateSubKey)) != 0;
+bool WantsWrite(int32_t access) {
+    return (access & (kKeySetValue | kKeyCreateSubKey)) != 0;
 }
 
 }  // namespace
 
-FileRegistry::FileRegistry(std::string sFolder, MachineAccess eMachine)
-    : msFolder(std::move(sFolder)) {
-    mvRoots[0].Code = kHkeyCurrentUser;
-    mvRoots[0].Name = "HKEY_CURRENT_USER";
-    mvRoots[0].Path = msFolder + "/" + kCurrentUserFile;
-    mvRoots[0].Writable = true;
-    mvRoots[1].Code = kHkeyLocalMachine;
-    mvRoots[1].Name = "HKEY_LOCAL_MACHINE";
-    mvRoots[1].Path = msFolder + "/" + kLocalMachineFile;
-    mvRoots[1].Writable = eMachine == MachineAccess::ReadWrite;
+FileRegistry::FileRegistry(std::string folder, MachineAccess machine) : folder_(std::move(folder)) {
+    roots_[0].code = kHkeyCurrentUser;
+    roots_[0].name = "HKEY_CURRENT_USER";
+    roots_[0].path = folder_ + "/" + kCurrentUserFile;
+    roots_[0].writable = true;
+    roots_[1].code = kHkeyLocalMachine;
+    roots_[1].name = "HKEY_LOCAL_MACHINE";
+    roots_[1].path = folder_ + "/" + kLocalMachineFile;
+    roots_[1].writable = machine == MachineAccess::ReadWrite;
 }
 
-bool FileRegistry::Locate(Key hKey, Location& cLocation) {
-    for (Root& root : mvRoots) {
-        if (root.Code == hKey) {
-            cLocation = Location{&root, {}, root.Writable};
+bool FileRegistry::Locate(Key key, Location& location) {
+    for (Root& root : roots_) {
+        if (root.code == key) {
+            location = Location{&root, {}, root.writable};
             return true;
         }
     }
-    const auto handle = mcHandles.find(hKey);
-    if (handle == mcHandles.end()) {
+    const auto handle = handles_.find(key);
+    if (handle == handles_.end()) {
         return false;
     }
-    cLocation = handle->second;
+    location = handle->second;
     return true;
 }
 
-bool FileRegistry::Descend(Location& cLocation, const std::string& sSubKey) {
+bool FileRegistry::Descend(Location& location, const std::string& subKey) {
     std::vector<std::string> names;
-    if (!RegistryKey::SplitPath(sSubKey, names) ||
-        cLocation.Path.size() + names.size() > RegistryKey::kMaxDepth) {
+    if (!RegistryKey::SplitPath(subKey, names) ||
+        location.path.size() + names.size() > RegistryKey::kMaxDepth) {
         return false;
     }
-    cLocation.Path.insert(cLocation.Path.end(), names.begin(), names.end());
+    location.path.insert(location.path.end(), names.begin(), names.end());
     return true;
 }
 
-const RegistryKey* FileRegistry::Find(const Location& cLocation) {
-    Refresh(*cLocation.Owner);
-    return cLocation.Owner->Tree.Find(cLocation.Path);
+const RegistryKey* FileRegistry::Find(const Location& location) {
+    Refresh(*location.owner);
+    return location.owner->tree.Find(location.path);
 }
 
-void FileRegistry::Refresh(Root& cRoot) {
-    const AtomicFile file(cRoot.Path);
-    if (file.Stamp() == cRoot.Stamp) {
+void FileRegistry::Refresh(Root& root) {
+    const AtomicFile file(root.path);
+    if (file.Stamp() == root.stamp) {
         return;
     }
     FileRead read = file.Read();
     bool damaged = false;
-    cRoot.Tree = RegistryFile::Parse(read.Status == ReadStatus::Read ? read.Text : "", damaged);
-    cRoot.Stamp = std::move(read.Stamp);
+    root.tree = RegistryFile::Parse(read.status == ReadStatus::Read ? read.text : "", damaged);
+    root.stamp = std::move(read.stamp);
 }
 
-int32_t FileRegistry::Change(Root& cRoot, const std::function<bool(RegistryKey&)>& fChange) {
-    int error = AtomicFile::MakeFolders(msFolder);
-    AtomicFile file(cRoot.Path);
-    if (error == 0) {
+int32_t FileRegistry::Change(Root& root, const std::function<bool(RegistryKey&)>& change) {
+    std::error_code error = AtomicFile::MakeFolders(folder_);
+    AtomicFile file(root.path);
+    if (!error) {
         error = file.Lock();
     }
     FileRead read;
-    if (error == 0) {
+    if (!error) {
         read = file.Read();
-        error = read.Status == ReadStatus::Unreadable ? read.Error : 0;
+        error = read.status == ReadStatus::Unreadable ? read.error : std::error_code();
     }
-    if (error != 0) {
+    if (error) {
         return RegistryCode(error);
     }
     bool damaged = false;
-    RegistryKey tree = RegistryFile::Parse(read.Text, damaged);
-    if (fChange(tree)) {
+    RegistryKey tree = RegistryFile::Parse(read.text, damaged);
+    if (change(tree)) {
         std::string aside;
-        error = damaged ? file.SetAside(aside) : 0;
-        if (error == 0) {
-            error = file.Replace(RegistryFile::Write(tree, cRoot.Name));
+        error = damaged ? file.SetAside(aside) : std::error_code();
+        if (!error) {
+            error = file.Replace(RegistryFile::Write(tree, root.name));
         }
-        if (error != 0) {
+        if (error) {
             return RegistryCode(error);
         }
-        read.Stamp = file.Stamp();
+        read.stamp = file.Stamp();
     }
-    cRoot.Tree = std::move(tree);
-    cRoot.Stamp = std::move(read.Stamp);
+    root.tree = std::move(tree);
+    root.stamp = std::move(read.stamp);
     return kErrorSuccess;
 }
 
-FileRegistry::Key FileRegistry::NewHandle(Location cLocation) {
-    while (mcHandles.count(mlNextHandle) != 0) {
-        mlNextHandle = mlNextHandle == std::numeric_limits<Key>::max() ? 1 : mlNextHandle + 1;
+FileRegistry::Key FileRegistry::NewHandle(Location location) {
+    while (handles_.count(nextHandle_) != 0) {
+        nextHandle_ = nextHandle_ == std::numeric_limits<Key>::max() ? 1 : nextHandle_ + 1;
     }
-    const Key handle = mlNextHandle;
-    mcHandles.emplace(handle, std::move(cLocation));
+    const Key handle = nextHandle_;
+    handles_.emplace(handle, std::move(location));
     return handle;
 }
 
-int32_t FileRegistry::OpenKey(Key hKey, const std::string& sSubKey, int32_t lAccess, Key& hResult) {
+int32_t FileRegistry::OpenKey(Key key, const std::string& subKey, int32_t access, Key& result) {
     Location location;
-    if (!Locate(hKey, location)) {
+    if (!Locate(key, location)) {
         return kErrorInvalidHandle;
     }
-    if (!Descend(location, sSubKey)) {
+    if (!Descend(location, subKey)) {
         return kErrorFileNotFound;
     }
-    if (WantsWrite(lAccess) && !location.Owner->Writable) {
+    if (WantsWrite(access) && !location.owner->writable) {
         return kErrorAccessDenied;
     }
     if (Find(location) == nullptr) {
         return kErrorFileNotFound;
     }
-    location.Writable = WantsWrite(lAccess);
-    hResult = NewHandle(std::move(location));
+    location.writable = WantsWrite(access);
+    result = NewHandle(std::move(location));
     return kErrorSuccess;
 }
 
-int32_t FileRegistry::CreateKey(Key hKey, const std::string& sSubKey, int32_t lAccess,
-                                Key& hResult) {
+int32_t FileRegistry::CreateKey(Key key, const std::string& subKey, int32_t access, Key& result) {
     Location location;
-    if (!Locate(hKey, location)) {
+    if (!Locate(key, location)) {
         return kErrorInvalidHandle;
     }
-    const bool parentWritable = location.Writable;
-    if (!Descend(location, sSubKey)) {
+    const bool parentWritable = location.writable;
+    if (!Descend(location, subKey)) {
         return kErrorInvalidParameter;
     }
     if (Find(location) == nullptr) {
-        if (!parentWritable || !location.Owner->Writable) {
+        if (!parentWritable || !location.owner->writable) {
             return kErrorAccessDenied;
         }
-        const int32_t error = Change(*location.Owner, [&location](RegistryKey& cTree) {
-            const bool missing = cTree.Find(location.Path) == nullptr;
-            cTree.Make(location.Path);
+        const int32_t error = Change(*location.owner, [&location](RegistryKey& tree) {
+            const bool missing = tree.Find(location.path) == nullptr;
+            tree.Make(location.path);
             return missing;
         });
         if (error != kErrorSuccess) {
             return error;
         }
     }
-    if (WantsWrite(lAccess) && !location.Owner->Writable) {
+    if (WantsWrite(access) && !location.owner->writable) {
         return kErrorAccessDenied;
     }
-    location.Writable = WantsWrite(lAccess);
-    hResult = NewHandle(std::move(location));
+    location.writable = WantsWrite(access);
+    result = NewHandle(std::move(location));
     return kErrorSuccess;
 }
 
-int32_t FileRegistry::QueryValue(Key hKey, const std::string& sName, int32_t& lType,
-                                 std::string& sData, int32_t& lByteCount) {
+int32_t FileRegistry::QueryValue(Key key, const std::string& name, int32_t& type, std::string& data,
+                                 int32_t& byteCount) {
     Location location;
-    if (!Locate(hKey, location)) {
+    if (!Locate(key, location)) {
         return kErrorInvalidHandle;
     }
-    const RegistryKey* key = Find(location);
-    const RegistryValue* value = key == nullptr ? nullptr : key->Value(sName);
+    const RegistryKey* found = Find(location);
+    const RegistryValue* value = found == nullptr ? nullptr : found->Value(name);
     if (value == nullptr) {
         return kErrorFileNotFound;
     }
-    lType = value->Type;
-    const auto needed = static_cast<int32_t>(value->Data.size());
-    const bool fits = lByteCount >= needed;
-    lByteCount = needed;
+    type = value->type;
+    const auto needed = static_cast<int32_t>(value->data.size());
+    const bool fits = byteCount >= needed;
+    byteCount = needed;
     if (!fits) {
         return kErrorMoreData;
     }
-    sData = value->Data;
+    data = value->data;
     return kErrorSuccess;
 }
 
-int32_t FileRegistry::SetValue(Key hKey, const std::string& sName, int32_t lType,
-                               const std::string& sData) {
+int32_t FileRegistry::SetValue(Key key, const std::string& name, int32_t type,
+                               const std::string& data) {
     Location location;
-    if (!Locate(hKey, location)) {
+    if (!Locate(key, location)) {
         return kErrorInvalidHandle;
     }
-    if (!location.Writable) {
+    if (!location.writable) {
         return kErrorAccessDenied;
     }
-    if (sName.size() > RegistryKey::kMaxValueNameBytes) {
+    if (name.size() > RegistryKey::kMaxValueNameBytes) {
         return kErrorInvalidParameter;
     }
-    return Change(*location.Owner, [&](RegistryKey& cTree) {
-        return cTree.Make(location.Path).SetValue(sName, RegistryValue{lType, sData});
+    return Change(*location.owner, [&](RegistryKey& tree) {
+        return tree.Make(location.path).SetValue(name, RegistryValue{type, data});
     });
 }
 
-int32_t FileRegistry::EnumKey(Key hKey, int32_t lIndex, std::string& sName, int32_t lBufferSize) {
+int32_t FileRegistry::EnumKey(Key key, int32_t index, std::string& name, int32_t bufferSize) {
     Location location;
-    if (!Locate(hKey, location)) {
+    if (!Locate(key, location)) {
         return kErrorInvalidHandle;
     }
-    const RegistryKey* key = Find(location);
-    if (key == nullptr) {
+    const RegistryKey* found = Find(location);
+    if (found == nullptr) {
         return kErrorFileNotFound;
     }
-    const RegistryKey* subKey = lIndex < 0 ? nullptr : key->SubKey(static_cast<size_t>(lIndex));
+    const RegistryKey* subKey = index < 0 ? nullptr : found->SubKey(static_cast<size_t>(index));
     if (subKey == nullptr) {
         return kErrorNoMoreItems;
     }
-    if (static_cast<int64_t>(subKey->Name().size()) + 1 > lBufferSize) {
+    if (static_cast<int64_t>(subKey->Name().size()) + 1 > bufferSize) {
         return kErrorMoreData;
     }
-    sName = subKey->Name();
+    name = subKey->Name();
     return kErrorSuccess;
 }
 
-int32_t FileRegistry::CloseKey(Key hKey) {
-    for (const Root& root : mvRoots) {
-        if (root.Code == hKey) {
+int32_t FileRegistry::CloseKey(Key key) {
+    for (const Root& root : roots_) {
+        if (root.code == key) {
             return kErrorSuccess;
         }
     }
-    return mcHandles.erase(hKey) == 1 ? kErrorSuccess : kErrorInvalidHandle;
+    return handles_.erase(key) == 1 ? kErrorSuccess : kErrorInvalidHandle;
 }
 
 }  // namespace cv::posix

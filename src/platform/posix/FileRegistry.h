@@ -50,47 +50,47 @@ class FileRegistry : public platform::RegistryApi {
     static constexpr const char* kCurrentUserFile = "HKEY_CURRENT_USER.registry";
     static constexpr const char* kLocalMachineFile = "HKEY_LOCAL_MACHINE.registry";
 
-    explicit FileRegistry(std::string sFolder = ConfigFolder(),
-                          MachineAccess eMachine = MachineAccess::ReadOnly);
+    explicit FileRegistry(std::string folder = ConfigFolder(),
+                          MachineAccess machine = MachineAccess::ReadOnly);
 
-    int32_t OpenKey(Key hKey, const std::string& sSubKey, int32_t lAccess, Key& hResult) override;
-    int32_t CreateKey(Key hKey, const std::string& sSubKey, int32_t lAccess, Key& hResult) override;
-    int32_t QueryValue(Key hKey, const std::string& sName, int32_t& lType, std::string& sData,
-                       int32_t& lByteCount) override;
-    int32_t SetValue(Key hKey, const std::string& sName, int32_t lType,
-                     const std::string& sData) override;
-    int32_t EnumKey(Key hKey, int32_t lIndex, std::string& sName, int32_t lBufferSize) override;
-    int32_t CloseKey(Key hKey) override;
+    int32_t OpenKey(Key key, const std::string& subKey, int32_t access, Key& result) override;
+    int32_t CreateKey(Key key, const std::string& subKey, int32_t access, Key& result) override;
+    int32_t QueryValue(Key key, const std::string& name, int32_t& type, std::string& data,
+                       int32_t& byteCount) override;
+    int32_t SetValue(Key key, const std::string& name, int32_t type,
+                     const std::string& data) override;
+    int32_t EnumKey(Key key, int32_t index, std::string& name, int32_t bufferSize) override;
+    int32_t CloseKey(Key key) override;
 
   private:
     struct Root {
-        int32_t Code = 0;
-        std::string Name;
-        std::string Path;
-        bool Writable = false;
-        RegistryKey Tree;
-        FileStamp Stamp;
+        int32_t code = 0;
+        std::string name;
+        std::string path;
+        bool writable = false;
+        RegistryKey tree;
+        FileStamp stamp;
     };
     // Where a key handle points.
     struct Location {
-        Root* Owner = nullptr;
-        std::vector<std::string> Path;
-        bool Writable = false;
+        Root* owner = nullptr;
+        std::vector<std::string> path;
+        bool writable = false;
     };
 
-    bool Locate(Key hKey, Location& cLocation);
-    static bool Descend(Location& cLocation, const std::string& sSubKey);
-    const RegistryKey* Find(const Location& cLocation);
-    void Refresh(Root& cRoot);
-    // Applies fChange (which says whether it changed anything) to the file's
+    bool Locate(Key key, Location& location);
+    static bool Descend(Location& location, const std::string& subKey);
+    const RegistryKey* Find(const Location& location);
+    void Refresh(Root& root);
+    // Applies change (which says whether it changed anything) to the file's
     // current tree under the lock and writes the result.
-    int32_t Change(Root& cRoot, const std::function<bool(RegistryKey&)>& fChange);
-    Key NewHandle(Location cLocation);
+    int32_t Change(Root& root, const std::function<bool(RegistryKey&)>& change);
+    Key NewHandle(Location location);
 
-    std::string msFolder;
-    std::array<Root, 2> mvRoots;
-    std::map<Key, Location> mcHandles;
-    Key mlNextHandle = 1;
+    std::string folder_;
+    std::array<Root, 2> roots_;
+    std::map<Key, Location> handles_;
+    Key nextHandle_ = 1;
 };
 
 }  // namespace cv::posix

@@ -4,38 +4,38 @@ namespace cv::posix {
 
 namespace {
 
-int64_t Nanoseconds(const struct timespec& tTime) {
-    return static_cast<int64_t>(tTime.tv_sec) * 1000000000 + tTime.tv_nsec;
+int64_t Nanoseconds(const struct timespec& time) {
+    return static_cast<int64_t>(time.tv_sec) * 1000000000 + time.tv_nsec;
 }
 
 }  // namespace
 
-FileStamp FileStamp::OfStat(const struct stat& tInfo, std::shared_ptr<const UniqueFd> cPin) {
+FileStamp FileStamp::OfStat(const struct stat& info, std::shared_ptr<const UniqueFd> pin) {
     FileStamp stamp;
-    stamp.mbExists = true;
-    stamp.mlDevice = static_cast<uint64_t>(tInfo.st_dev);
-    stamp.mlInode = static_cast<uint64_t>(tInfo.st_ino);
-    stamp.mlSize = static_cast<int64_t>(tInfo.st_size);
-    stamp.mlModifiedNs = Nanoseconds(tInfo.st_mtim);
-    stamp.mlChangedNs = Nanoseconds(tInfo.st_ctim);
-    stamp.mcPin = std::move(cPin);
+    stamp.exists_ = true;
+    stamp.device_ = static_cast<uint64_t>(info.st_dev);
+    stamp.inode_ = static_cast<uint64_t>(info.st_ino);
+    stamp.size_ = static_cast<int64_t>(info.st_size);
+    stamp.modifiedNs_ = Nanoseconds(info.st_mtim);
+    stamp.changedNs_ = Nanoseconds(info.st_ctim);
+    stamp.pin_ = std::move(pin);
     return stamp;
 }
 
-FileStamp FileStamp::OfPath(const std::string& sPath) {
+FileStamp FileStamp::OfPath(const std::string& path) {
     struct stat info {};
-    if (::stat(sPath.c_str(), &info) != 0) {
+    if (::stat(path.c_str(), &info) != 0) {
         return FileStamp();
     }
     return OfStat(info);
 }
 
-bool FileStamp::operator==(const FileStamp& cOther) const {
-    if (!mbExists || !cOther.mbExists) {
-        return mbExists == cOther.mbExists;
+bool FileStamp::operator==(const FileStamp& other) const {
+    if (!exists_ || !other.exists_) {
+        return exists_ == other.exists_;
     }
-    return mlDevice == cOther.mlDevice && mlInode == cOther.mlInode && mlSize == cOther.mlSize &&
-           mlModifiedNs == cOther.mlModifiedNs && mlChangedNs == cOther.mlChangedNs;
+    return device_ == other.device_ && inode_ == other.inode_ && size_ == other.size_ &&
+           modifiedNs_ == other.modifiedNs_ && changedNs_ == other.changedNs_;
 }
 
 }  // namespace cv::posix

@@ -20,23 +20,23 @@ class FileStamp {
   public:
     // A missing file.
     FileStamp() = default;
-    static FileStamp OfStat(const struct stat& tInfo, std::shared_ptr<const UniqueFd> cPin = {});
+    static FileStamp OfStat(const struct stat& info, std::shared_ptr<const UniqueFd> pin = {});
     // Follows symbolic links; a path that cannot be examined gives a missing stamp.
-    static FileStamp OfPath(const std::string& sPath);
+    static FileStamp OfPath(const std::string& path);
 
-    bool Exists() const { return mbExists; }
-    int64_t Size() const { return mlSize; }
+    bool Exists() const { return exists_; }
+    int64_t Size() const { return size_; }
     // Equal when both describe the same version (the pin plays no part).
-    bool operator==(const FileStamp& cOther) const;
+    bool operator==(const FileStamp& other) const;
 
   private:
-    bool mbExists = false;
-    uint64_t mlDevice = 0;
-    uint64_t mlInode = 0;
-    int64_t mlSize = 0;
-    int64_t mlModifiedNs = 0;
-    int64_t mlChangedNs = 0;
-    std::shared_ptr<const UniqueFd> mcPin;
+    bool exists_ = false;
+    uint64_t device_ = 0;
+    uint64_t inode_ = 0;
+    int64_t size_ = 0;
+    int64_t modifiedNs_ = 0;
+    int64_t changedNs_ = 0;
+    std::shared_ptr<const UniqueFd> pin_;
 };
 
 }  // namespace cv::posix

@@ -56,21 +56,21 @@ class IniDocument {
     // An empty text, as a file that does not exist yet.
     IniDocument() = default;
 
-    static IniDocument Parse(std::string_view sText);
+    static IniDocument Parse(std::string_view text);
     std::string Serialise() const;
 
     // The value of the first entry of key in section; nothing when missing.
-    std::optional<std::string> Value(std::string_view sSection, std::string_view sKey) const;
+    std::optional<std::string> Value(std::string_view section, std::string_view key) const;
 
     // Each returns true when the text changed.
-    bool SetValue(std::string_view sSection, std::string_view sKey, std::string_view sValue);
-    bool EraseKey(std::string_view sSection, std::string_view sKey);
-    bool EraseSection(std::string_view sSection);
+    bool SetValue(std::string_view section, std::string_view key, std::string_view value);
+    bool EraseKey(std::string_view section, std::string_view key);
+    bool EraseSection(std::string_view section);
 
     // Whether a write of these names and value is accepted (see above).
-    static bool IsSectionName(std::string_view sSection);
-    static bool IsKeyName(std::string_view sKey);
-    static bool IsValueText(std::string_view sValue);
+    static bool IsSectionName(std::string_view section);
+    static bool IsKeyName(std::string_view key);
+    static bool IsValueText(std::string_view value);
 
   private:
     enum class LineEnd : uint8_t { None, Lf, CrLf };
@@ -89,19 +89,19 @@ class IniDocument {
         std::unordered_map<std::string, uint32_t> keys;
     };
 
-    void AppendLine(std::string_view sText, LineEnd eEnd);
-    void IndexKeys(uint32_t lBlock);
+    void AppendLine(std::string_view text, LineEnd end);
+    void IndexKeys(uint32_t block);
     void IndexSections();
-    const std::vector<uint32_t>* BlocksOf(std::string_view sSection) const;
+    const std::vector<uint32_t>* BlocksOf(std::string_view section) const;
     void EndLastLine();
-    Line NewLine(std::string sText) const;
-    void AppendSection(std::string_view sSection, std::string_view sKey, std::string_view sValue);
+    Line NewLine(std::string text) const;
+    void AppendSection(std::string_view section, std::string_view key, std::string_view value);
 
-    bool mbByteOrderMark = false;
-    LineEnd meNewLineEnd = LineEnd::CrLf;
-    std::vector<Block> mcBlocks{Block{}};
+    bool byteOrderMark_ = false;
+    LineEnd newLineEnd_ = LineEnd::CrLf;
+    std::vector<Block> blocks_{Block{}};
     // Lower-cased section name -> its blocks, in file order.
-    std::unordered_map<std::string, std::vector<uint32_t>> mcSections;
+    std::unordered_map<std::string, std::vector<uint32_t>> sections_;
 };
 
 }  // namespace cv::posix

@@ -20,14 +20,14 @@ bool IsBlank(char c) {
     return c == ' ' || c == '\t';
 }
 
-std::string_view Trimmed(std::string_view sLine) {
-    while (!sLine.empty() && IsBlank(sLine.front())) {
-        sLine.remove_prefix(1);
+std::string_view Trimmed(std::string_view line) {
+    while (!line.empty() && IsBlank(line.front())) {
+        line.remove_prefix(1);
     }
-    while (!sLine.empty() && IsBlank(sLine.back())) {
-        sLine.remove_suffix(1);
+    while (!line.empty() && IsBlank(line.back())) {
+        line.remove_suffix(1);
     }
-    return sLine;
+    return line;
 }
 
 int HexValue(char c) {
@@ -43,36 +43,36 @@ int HexValue(char c) {
     return -1;
 }
 
-// Two hex digits at lPos.
-bool ReadHexByte(std::string_view sText, size_t lPos, char& cByte) {
-    if (lPos + 2 > sText.size() || HexValue(sText[lPos]) < 0 || HexValue(sText[lPos + 1]) < 0) {
+// Two hex digits at pos.
+bool ReadHexByte(std::string_view text, size_t pos, char& byte) {
+    if (pos + 2 > text.size() || HexValue(text[pos]) < 0 || HexValue(text[pos + 1]) < 0) {
         return false;
     }
-    cByte = static_cast<char>(HexValue(sText[lPos]) * 16 + HexValue(sText[lPos + 1]));
+    byte = static_cast<char>(HexValue(text[pos]) * 16 + HexValue(text[pos + 1]));
     return true;
 }
 
-// 1 to 8 hex digits, the whole of sText.
-bool ReadHexNumber(std::string_view sText, uint32_t& lNumber) {
-    if (sText.empty() || sText.size() > 8) {
+// 1 to 8 hex digits, the whole of text.
+bool ReadHexNumber(std::string_view text, uint32_t& number) {
+    if (text.empty() || text.size() > 8) {
         return false;
     }
-    lNumber = 0;
-    for (const char c : sText) {
+    number = 0;
+    for (const char c : text) {
         if (HexValue(c) < 0) {
             return false;
         }
-        lNumber = lNumber * 16 + static_cast<uint32_t>(HexValue(c));
+        number = number * 16 + static_cast<uint32_t>(HexValue(c));
     }
     return true;
 }
 
-// A quoted text starting at sLine[lPos]; the position after its closing
+// A quoted text starting at line[start]; the position after its closing
 // quote, or npos when it is malformed.
-size_t ReadQuoted(std::string_view sLine, size_t lPos, std::string& sText) {
-    sText.clear();
-    for (size_t pos = lPos + 1; pos < sLine.size(); ++pos) {
-        const char c = sLine[pos];
+size_t ReadQuoted(std::string_view line, size_t start, std::string& text) {
+    text.clear();
+    for (size_t pos = start + 1; pos < line.size(); ++pos) {
+        const char c = line[pos];
         if (c == '"') {
             return pos + 1;
         }
@@ -80,49 +80,49 @@ size_t ReadQuoted(std::string_view sLine, size_t lPos, std::string& sText) {
             return std::string_view::npos;
         }
         if (c != '\\') {
-            sText += c;
+            text += c;
             continue;
         }
-        const char next = pos + 1 < sLine.size() ? sLine[pos + 1] : '\0';
+        const char next = pos + 1 < line.size() ? line[pos + 1] : '\0';
         char escaped = next;
-        if (next == 'x' && ReadHexByte(sLine, pos + 2, escaped)) {
+        if (next == 'x' && ReadHexByte(line, pos + 2, escaped)) {
             pos += 2;
         } else if (next != '\\' && next != '"') {
             return std::string_view::npos;
         }
-        sText += escaped;
+        text += escaped;
         ++pos;
     }
     return std::string_view::npos;
 }
 
-bool ReadKeyName(std::string_view sEscaped, std::string& sName) {
-    sName.clear();
-    for (size_t pos = 0; pos < sEscaped.size(); ++pos) {
-        char c = sEscaped[pos];
-        if (IsControl(c) || (c == '%' && !ReadHexByte(sEscaped, pos + 1, c))) {
+bool ReadKeyName(std::string_view escaped, std::string& name) {
+    name.clear();
+    for (size_t pos = 0; pos < escaped.size(); ++pos) {
+        char c = escaped[pos];
+        if (IsControl(c) || (c == '%' && !ReadHexByte(escaped, pos + 1, c))) {
             return false;
         }
-        pos += sEscaped[pos] == '%' ? 2 : 0;
-        sName += c;
+        pos += escaped[pos] == '%' ? 2 : 0;
+        name += c;
     }
-    return !sName.empty() && sName.size() <= RegistryKey::kMaxNameBytes &&
-           sName.find('\\') == std::string::npos;
+    return !name.empty() && name.size() <= RegistryKey::kMaxNameBytes &&
+           name.find('\\') == std::string::npos;
 }
 
-bool ReadKeyLine(std::string_view sLine, std::vector<std::string>& vPath) {
-    vPath.clear();
-    if (sLine.size() < 3 || sLine.back() != ']') {
+bool ReadKeyLine(std::string_view line, std::vector<std::string>& path) {
+    path.clear();
+    if (line.size() < 3 || line.back() != ']') {
         return false;
     }
-    std::string_view inner = sLine.substr(1, sLine.size() - 2);
+    std::string_view inner = line.substr(1, line.size() - 2);
     for (;;) {
         const size_t slash = inner.find('\\');
         std::string name;
-        if (vPath.size() == RegistryKey::kMaxDepth || !ReadKeyName(inner.substr(0, slash), name)) {
+        if (path.size() == RegistryKey::kMaxDepth || !ReadKeyName(inner.substr(0, slash), name)) {
             return false;
         }
-        vPath.push_back(std::move(name));
+        path.push_back(std::move(name));
         if (slash == std::string_view::npos) {
             return true;
         }
@@ -130,76 +130,75 @@ bool ReadKeyLine(std::string_view sLine, std::vector<std::string>& vPath) {
     }
 }
 
-bool ReadHexBytes(std::string_view sList, std::string& sBytes) {
-    sBytes.clear();
-    for (size_t pos = 0; pos < sList.size(); pos += 3) {
+bool ReadHexBytes(std::string_view list, std::string& bytes) {
+    bytes.clear();
+    for (size_t pos = 0; pos < list.size(); pos += 3) {
         char c = 0;
-        if (!ReadHexByte(sList, pos, c) || (pos + 2 < sList.size() && sList[pos + 2] != ',') ||
-            pos + 3 == sList.size()) {
+        if (!ReadHexByte(list, pos, c) || (pos + 2 < list.size() && list[pos + 2] != ',') ||
+            pos + 3 == list.size()) {
             return false;
         }
-        sBytes += c;
+        bytes += c;
     }
     return true;
 }
 
-bool ReadData(std::string_view sData, RegistryValue& cValue) {
-    if (!sData.empty() && sData.front() == '"') {
-        cValue.Type = 1;
-        const bool whole = ReadQuoted(sData, 0, cValue.Data) == sData.size();
-        cValue.Data += '\0';
+bool ReadData(std::string_view data, RegistryValue& value) {
+    if (!data.empty() && data.front() == '"') {
+        value.type = 1;
+        const bool whole = ReadQuoted(data, 0, value.data) == data.size();
+        value.data += '\0';
         return whole;
     }
     uint32_t number = 0;
-    if (sData.substr(0, kDwordTag.size()) == kDwordTag) {
-        if (!ReadHexNumber(sData.substr(kDwordTag.size()), number)) {
+    if (data.substr(0, kDwordTag.size()) == kDwordTag) {
+        if (!ReadHexNumber(data.substr(kDwordTag.size()), number)) {
             return false;
         }
-        cValue.Type = 4;
-        cValue.Data.clear();
+        value.type = 4;
+        value.data.clear();
         for (int shift = 0; shift < 32; shift += 8) {
-            cValue.Data += static_cast<char>((number >> shift) & 0xFF);
+            value.data += static_cast<char>((number >> shift) & 0xFF);
         }
         return true;
     }
-    const size_t close = sData.find("):");
-    if (sData.substr(0, kHexTag.size()) != kHexTag || close == std::string_view::npos ||
-        !ReadHexNumber(sData.substr(kHexTag.size(), close - kHexTag.size()), number)) {
+    const size_t close = data.find("):");
+    if (data.substr(0, kHexTag.size()) != kHexTag || close == std::string_view::npos ||
+        !ReadHexNumber(data.substr(kHexTag.size(), close - kHexTag.size()), number)) {
         return false;
     }
-    cValue.Type = static_cast<int32_t>(number);
-    return ReadHexBytes(sData.substr(close + 2), cValue.Data);
+    value.type = static_cast<int32_t>(number);
+    return ReadHexBytes(data.substr(close + 2), value.data);
 }
 
-bool ReadValueLine(std::string_view sLine, std::string& sName, RegistryValue& cValue) {
+bool ReadValueLine(std::string_view line, std::string& name, RegistryValue& value) {
     size_t pos = 1;
-    sName.clear();
-    if (sLine.front() == '"') {
-        pos = ReadQuoted(sLine, 0, sName);
+    name.clear();
+    if (line.front() == '"') {
+        pos = ReadQuoted(line, 0, name);
     }
-    while (pos < sLine.size() && IsBlank(sLine[pos])) {
+    while (pos < line.size() && IsBlank(line[pos])) {
         ++pos;
     }
-    if (pos >= sLine.size() || sLine[pos] != '=' ||
-        sName.size() > RegistryKey::kMaxValueNameBytes) {
+    if (pos >= line.size() || line[pos] != '=' || name.size() > RegistryKey::kMaxValueNameBytes) {
         return false;
     }
-    return ReadData(Trimmed(sLine.substr(pos + 1)), cValue);
+    return ReadData(Trimmed(line.substr(pos + 1)), value);
 }
 
-std::string_view NextLine(std::string_view& sText) {
-    const size_t end = sText.find('\n');
-    std::string_view line = sText.substr(0, end);
-    sText = end == std::string_view::npos ? std::string_view() : sText.substr(end + 1);
+std::string_view NextLine(std::string_view& text) {
+    const size_t end = text.find('\n');
+    std::string_view line = text.substr(0, end);
+    text = end == std::string_view::npos ? std::string_view() : text.substr(end + 1);
     if (!line.empty() && line.back() == '\r') {
         line.remove_suffix(1);
     }
     return line;
 }
 
-std::string Quoted(std::string_view sText) {
+std::string Quoted(std::string_view text) {
     std::string quoted = "\"";
-    for (const char c : sText) {
+    for (const char c : text) {
         if (IsControl(c)) {
             const auto code = static_cast<unsigned char>(c);
             quoted += "\\x";
@@ -213,9 +212,9 @@ std::string Quoted(std::string_view sText) {
     return quoted + "\"";
 }
 
-std::string EscapedKeyName(std::string_view sName) {
+std::string EscapedKeyName(std::string_view name) {
     std::string escaped;
-    for (const char c : sName) {
+    for (const char c : name) {
         if (IsControl(c) || c == '%') {
             const auto code = static_cast<unsigned char>(c);
             escaped += '%';
@@ -228,106 +227,105 @@ std::string EscapedKeyName(std::string_view sName) {
     return escaped;
 }
 
-std::string DataText(const RegistryValue& cValue) {
-    if (cValue.Type == 1 && !cValue.Data.empty() && cValue.Data.back() == '\0') {
-        return Quoted(std::string_view(cValue.Data).substr(0, cValue.Data.size() - 1));
+std::string DataText(const RegistryValue& value) {
+    if (value.type == 1 && !value.data.empty() && value.data.back() == '\0') {
+        return Quoted(std::string_view(value.data).substr(0, value.data.size() - 1));
     }
     std::string text;
-    const auto hex = [&text](uint32_t lNumber, int iDigits) {
-        for (int shift = (iDigits - 1) * 4; shift >= 0; shift -= 4) {
-            text += kHexDigits[(lNumber >> shift) & 15];
+    const auto hex = [&text](uint32_t number, int digits) {
+        for (int shift = (digits - 1) * 4; shift >= 0; shift -= 4) {
+            text += kHexDigits[(number >> shift) & 15];
         }
     };
-    if (cValue.Type == 4 && cValue.Data.size() == 4) {
+    if (value.type == 4 && value.data.size() == 4) {
         uint32_t number = 0;
         for (int i = 3; i >= 0; --i) {
-            number =
-                (number << 8) | static_cast<unsigned char>(cValue.Data[static_cast<size_t>(i)]);
+            number = (number << 8) | static_cast<unsigned char>(value.data[static_cast<size_t>(i)]);
         }
         text = kDwordTag;
         hex(number, 8);
         return text;
     }
     text = kHexTag;
-    const auto type = static_cast<uint32_t>(cValue.Type);
+    const auto type = static_cast<uint32_t>(value.type);
     int digits = 1;
     while (digits < 8 && (type >> (digits * 4)) != 0) {
         ++digits;
     }
     hex(type, digits);
     text += "):";
-    for (size_t i = 0; i < cValue.Data.size(); ++i) {
+    for (size_t i = 0; i < value.data.size(); ++i) {
         text += i == 0 ? "" : ",";
-        hex(static_cast<unsigned char>(cValue.Data[i]), 2);
+        hex(static_cast<unsigned char>(value.data[i]), 2);
     }
     return text;
 }
 
-void WriteValues(const RegistryKey& cKey, std::string& sOut) {
-    for (const auto& [name, value] : cKey.Values()) {
-        sOut += name.empty() ? "@" : Quoted(name);
-        sOut += "=" + DataText(value) + "\n";
+void WriteValues(const RegistryKey& key, std::string& out) {
+    for (const auto& [name, value] : key.Values()) {
+        out += name.empty() ? "@" : Quoted(name);
+        out += "=" + DataText(value) + "\n";
     }
 }
 
-void WriteKey(const RegistryKey& cKey, const std::string& sParentPath, std::string& sOut) {
+void WriteKey(const RegistryKey& key, const std::string& parentPath, std::string& out) {
     const std::string path =
-        (sParentPath.empty() ? "" : sParentPath + "\\") + EscapedKeyName(cKey.Name());
-    if (!cKey.Values().empty() || cKey.SubKeyCount() == 0) {
-        sOut += "\n[" + path + "]\n";
-        WriteValues(cKey, sOut);
+        (parentPath.empty() ? "" : parentPath + "\\") + EscapedKeyName(key.Name());
+    if (!key.Values().empty() || key.SubKeyCount() == 0) {
+        out += "\n[" + path + "]\n";
+        WriteValues(key, out);
     }
-    cKey.ForEachSubKey([&](const RegistryKey& cSubKey) { WriteKey(cSubKey, path, sOut); });
+    key.ForEachSubKey([&](const RegistryKey& subKey) { WriteKey(subKey, path, out); });
 }
 
 }  // namespace
 
-RegistryKey RegistryFile::Parse(std::string_view sText, bool& bDamaged) {
+RegistryKey RegistryFile::Parse(std::string_view text, bool& damaged) {
     RegistryKey root;
-    bDamaged = false;
-    if (sText.empty()) {
+    damaged = false;
+    if (text.empty()) {
         return root;
     }
-    if (sText.substr(0, kByteOrderMark.size()) == kByteOrderMark) {
-        sText.remove_prefix(kByteOrderMark.size());
+    if (text.substr(0, kByteOrderMark.size()) == kByteOrderMark) {
+        text.remove_prefix(kByteOrderMark.size());
     }
-    if (NextLine(sText) != kFirstLine) {
-        bDamaged = true;
+    if (NextLine(text) != kFirstLine) {
+        damaged = true;
         return root;
     }
     RegistryKey* current = &root;
     std::vector<std::string> path;
     std::string name;
     RegistryValue value;
-    while (!sText.empty()) {
-        const std::string_view line = Trimmed(NextLine(sText));
+    while (!text.empty()) {
+        const std::string_view line = Trimmed(NextLine(text));
         if (line.empty() || line.front() == ';') {
             continue;
         }
         if (line.front() == '[') {
             const bool good = ReadKeyLine(line, path);
             current = good ? &root.Make(path) : nullptr;
-            bDamaged = bDamaged || !good;
+            damaged = damaged || !good;
         } else if ((line.front() == '"' || line.front() == '@') && current != nullptr) {
             const bool good = ReadValueLine(line, name, value);
             if (good) {
                 current->SetValue(name, std::move(value));
             }
-            bDamaged = bDamaged || !good;
+            damaged = damaged || !good;
         } else {
-            bDamaged = true;
+            damaged = true;
         }
     }
     return root;
 }
 
-std::string RegistryFile::Write(const RegistryKey& cRoot, std::string_view sRootName) {
-    std::string text = std::string(kFirstLine) + "\n; " + std::string(sRootName) + "\n";
-    if (!cRoot.Values().empty()) {
+std::string RegistryFile::Write(const RegistryKey& root, std::string_view rootName) {
+    std::string text = std::string(kFirstLine) + "\n; " + std::string(rootName) + "\n";
+    if (!root.Values().empty()) {
         text += "\n";
-        WriteValues(cRoot, text);
+        WriteValues(root, text);
     }
-    cRoot.ForEachSubKey([&](const RegistryKey& cSubKey) { WriteKey(cSubKey, "", text); });
+    root.ForEachSubKey([&](const RegistryKey& subKey) { WriteKey(subKey, "", text); });
     return text;
 }
 

@@ -44,9 +44,9 @@ class RegistryFile {
   public:
     static constexpr std::string_view kFirstLine = "CvOpcTestClient registry file 1";
 
-    static RegistryKey Parse(std::string_view sText, bool& bDamaged);
-    // sRootName appears as a comment for people reading the file.
-    static std::string Write(const RegistryKey& cRoot, std::string_view sRootName);
+    static RegistryKey Parse(std::string_view text, bool& damaged);
+    // rootName appears as a comment for people reading the file.
+    static std::string Write(const RegistryKey& root, std::string_view rootName);
 };
 
 }  // namespace cv::posix

@@ -6,31 +6,31 @@
 
 namespace cv::posix {
 
-std::string RegistryKey::Folded(std::string_view sName) {
-    return AsciiUpper(sName);
+std::string RegistryKey::Folded(std::string_view name) {
+    return AsciiUpper(name);
 }
 
-bool RegistryKey::SplitPath(std::string_view sPath, std::vector<std::string>& vNames) {
-    vNames.clear();
-    while (!sPath.empty()) {
-        const size_t slash = sPath.find('\\');
-        const std::string_view name = sPath.substr(0, slash);
+bool RegistryKey::SplitPath(std::string_view path, std::vector<std::string>& names) {
+    names.clear();
+    while (!path.empty()) {
+        const size_t slash = path.find('\\');
+        const std::string_view name = path.substr(0, slash);
         if (!name.empty()) {
-            if (name.size() > kMaxNameBytes || vNames.size() == kMaxDepth) {
+            if (name.size() > kMaxNameBytes || names.size() == kMaxDepth) {
                 return false;
             }
-            vNames.emplace_back(name);
+            names.emplace_back(name);
         }
-        sPath = slash == std::string_view::npos ? std::string_view() : sPath.substr(slash + 1);
+        path = slash == std::string_view::npos ? std::string_view() : path.substr(slash + 1);
     }
     return true;
 }
 
-RegistryKey* RegistryKey::Find(const std::vector<std::string>& vPath) {
+RegistryKey* RegistryKey::Find(const std::vector<std::string>& path) {
     RegistryKey* key = this;
-    for (const std::string& name : vPath) {
-        const auto found = key->mcSubKeys.find(Folded(name));
-        if (found == key->mcSubKeys.end()) {
+    for (const std::string& name : path) {
+        const auto found = key->subKeys_.find(Folded(name));
+        if (found == key->subKeys_.end()) {
             return nullptr;
         }
         key = found->second.get();
@@ -38,49 +38,49 @@ RegistryKey* RegistryKey::Find(const std::vector<std::string>& vPath) {
     return key;
 }
 
-const RegistryKey* RegistryKey::Find(const std::vector<std::string>& vPath) const {
-    return const_cast<RegistryKey*>(this)->Find(vPath);
+const RegistryKey* RegistryKey::Find(const std::vector<std::string>& path) const {
+    return const_cast<RegistryKey*>(this)->Find(path);
 }
 
-RegistryKey& RegistryKey::Make(const std::vector<std::string>& vPath) {
+RegistryKey& RegistryKey::Make(const std::vector<std::string>& path) {
     RegistryKey* key = this;
-    for (const std::string& name : vPath) {
+    for (const std::string& name : path) {
         key = &key->MakeSubKey(name);
     }
     return *key;
 }
 
-RegistryKey& RegistryKey::MakeSubKey(const std::string& sName) {
-    auto& slot = mcSubKeys[Folded(sName)];
+RegistryKey& RegistryKey::MakeSubKey(const std::string& name) {
+    auto& slot = subKeys_[Folded(name)];
     if (!slot) {
-        slot = std::make_unique<RegistryKey>(sName);
+        slot = std::make_unique<RegistryKey>(name);
     }
     return *slot;
 }
 
-const RegistryKey* RegistryKey::SubKey(size_t lIndex) const {
-    if (lIndex >= mcSubKeys.size()) {
+const RegistryKey* RegistryKey::SubKey(size_t index) const {
+    if (index >= subKeys_.size()) {
         return nullptr;
     }
-    return std::next(mcSubKeys.begin(), static_cast<std::ptrdiff_t>(lIndex))->second.get();
+    return std::next(subKeys_.begin(), static_cast<std::ptrdiff_t>(index))->second.get();
 }
 
-const RegistryValue* RegistryKey::Value(std::string_view sName) const {
-    const auto found = mcValueIndex.find(Folded(sName));
-    return found == mcValueIndex.end() ? nullptr : &mvValues[found->second].second;
+const RegistryValue* RegistryKey::Value(std::string_view name) const {
+    const auto found = valueIndex_.find(Folded(name));
+    return found == valueIndex_.end() ? nullptr : &values_[found->second].second;
 }
 
-bool RegistryKey::SetValue(std::string_view sName, RegistryValue cValue) {
-    const auto [found, added] = mcValueIndex.try_emplace(Folded(sName), mvValues.size());
+bool RegistryKey::SetValue(std::string_view name, RegistryValue value) {
+    const auto [found, added] = valueIndex_.try_emplace(Folded(name), values_.size());
     if (added) {
-        mvValues.emplace_back(std::string(sName), std::move(cValue));
+        values_.emplace_back(std::string(name), std::move(value));
         return true;
     }
-    RegistryValue& held = mvValues[found->second].second;
-    if (held == cValue) {
+    RegistryValue& held = values_[found->second].second;
+    if (held == value) {
         return false;
     }
-    held = std::move(cValue);
+    held = std::move(value);
     return true;
 }
 

@@ -11,8 +11,8 @@
 namespace cv::posix {
 
 struct RegistryValue {
-    int32_t Type = 0;
-    std::string Data;  // the bytes exactly as set
+    int32_t type = 0;
+    std::string data;  // the bytes exactly as set
     bool operator==(const RegistryValue&) const = default;
 };
 
@@ -32,42 +32,42 @@ class RegistryKey {
     using NamedValue = std::pair<std::string, RegistryValue>;
 
     RegistryKey() = default;
-    explicit RegistryKey(std::string sName) : msName(std::move(sName)) {}
+    explicit RegistryKey(std::string name) : name_(std::move(name)) {}
 
-    const std::string& Name() const { return msName; }
+    const std::string& Name() const { return name_; }
 
     // Splits "A\B\C" into its names, skipping empty ones; false when a name
     // or the depth exceeds the limits.
-    static bool SplitPath(std::string_view sPath, std::vector<std::string>& vNames);
+    static bool SplitPath(std::string_view path, std::vector<std::string>& names);
 
-    RegistryKey* Find(const std::vector<std::string>& vPath);
-    const RegistryKey* Find(const std::vector<std::string>& vPath) const;
+    RegistryKey* Find(const std::vector<std::string>& path);
+    const RegistryKey* Find(const std::vector<std::string>& path) const;
     // Finds the key, creating it and the keys above it as needed.
-    RegistryKey& Make(const std::vector<std::string>& vPath);
+    RegistryKey& Make(const std::vector<std::string>& path);
 
-    size_t SubKeyCount() const { return mcSubKeys.size(); }
+    size_t SubKeyCount() const { return subKeys_.size(); }
     // In enumeration order; nullptr past the end.
-    const RegistryKey* SubKey(size_t lIndex) const;
+    const RegistryKey* SubKey(size_t index) const;
     template <typename Visit>
-    void ForEachSubKey(Visit&& fVisit) const {
-        for (const auto& entry : mcSubKeys) {
-            fVisit(*entry.second);
+    void ForEachSubKey(Visit&& visit) const {
+        for (const auto& entry : subKeys_) {
+            visit(*entry.second);
         }
     }
 
-    const RegistryValue* Value(std::string_view sName) const;
+    const RegistryValue* Value(std::string_view name) const;
     // True when this changed the key (a new value, or a new type or data).
-    bool SetValue(std::string_view sName, RegistryValue cValue);
-    const std::vector<NamedValue>& Values() const { return mvValues; }
+    bool SetValue(std::string_view name, RegistryValue value);
+    const std::vector<NamedValue>& Values() const { return values_; }
 
   private:
-    static std::string Folded(std::string_view sName);
-    RegistryKey& MakeSubKey(const std::string& sName);
+    static std::string Folded(std::string_view name);
+    RegistryKey& MakeSubKey(const std::string& name);
 
-    std::string msName;
-    std::map<std::string, std::unique_ptr<RegistryKey>> mcSubKeys;  // by folded name
-    std::vector<NamedValue> mvValues;
-    std::map<std::string, size_t> mcValueIndex;  // folded name to position in mvValues
+    std::string name_;
+    std::map<std::string, std::unique_ptr<RegistryKey>> subKeys_;  // by folded name
+    std::vector<NamedValue> values_;
+    std::map<std::string, size_t> valueIndex_;  // folded name to position in values_
 };
 
 }  // namespace cv::posix

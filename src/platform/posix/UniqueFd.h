@@ -10,11 +10,11 @@ namespace cv::posix {
 class UniqueFd {
   public:
     UniqueFd() = default;
-    explicit UniqueFd(int iFd) : miFd(iFd) {}
-    UniqueFd(UniqueFd&& cOther) noexcept : miFd(std::exchange(cOther.miFd, -1)) {}
-    UniqueFd& operator=(UniqueFd&& cOther) noexcept {
-        if (this != &cOther) {
-            Reset(std::exchange(cOther.miFd, -1));
+    explicit UniqueFd(int fd) : fd_(fd) {}
+    UniqueFd(UniqueFd&& other) noexcept : fd_(std::exchange(other.fd_, -1)) {}
+    UniqueFd& operator=(UniqueFd&& other) noexcept {
+        if (this != &other) {
+            Reset(std::exchange(other.fd_, -1));
         }
         return *this;
     }
@@ -22,17 +22,17 @@ class UniqueFd {
     UniqueFd& operator=(const UniqueFd&) = delete;
     ~UniqueFd() { Reset(); }
 
-    int Get() const { return miFd; }
-    bool Valid() const { return miFd >= 0; }
-    void Reset(int iFd = -1) {
-        if (miFd >= 0) {
-            ::close(miFd);
+    int Get() const { return fd_; }
+    bool Valid() const { return fd_ >= 0; }
+    void Reset(int fd = -1) {
+        if (fd_ >= 0) {
+            ::close(fd_);
         }
-        miFd = iFd;
+        fd_ = fd;
     }
 
   private:
-    int miFd = -1;
+    int fd_ = -1;
 };
 
 }  // namespace cv::posix

@@ -1,8 +1,9 @@
 #pragma once
 
+#include <memory>
+
 #include <QString>
 #include <QTextBrowser>
-#include <memory>
 
 #include "platform/Help.h"
 

@@ -1,8 +1,9 @@
 #include "platform/qt/QtDialogs.h"
 
-#include <QApplication>
 #include <array>
 #include <vector>
+
+#include <QApplication>
 
 namespace cv::qtui {
 

@@ -1,8 +1,9 @@
 #pragma once
 
+#include <string>
+
 #include <QMessageBox>
 #include <QString>
-#include <string>
 
 #include "platform/Dialogs.h"
 

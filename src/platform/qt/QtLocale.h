@@ -1,8 +1,9 @@
 #pragma once
 
+#include <string>
+
 #include <QLocale>
 #include <QString>
-#include <string>
 
 #include "platform/Locale.h"
 

@@ -1,14 +1,15 @@
 #include "ui/widgets/LoopControls.h"
 
+#include <string>
+
 #include <QComboBox>
 #include <QListWidget>
 #include <QStringList>
 #include <QVariant>
 #include <QWidget>
-#include <string>
 
-#include "app/Utility.h"
 #include "document/LoopClass.h"
+#include "util/FloatText.h"
 
 namespace cv {
 

@@ -1,13 +1,15 @@
 #include "platform/posix/FileProfiles.h"
 
-#include <gtest/gtest.h>
 #include <sys/wait.h>
 #include <unistd.h>
 
 #include <filesystem>
 #include <string>
 
+#include <gtest/gtest.h>
+
 #include "platform/posix/ProfilePath.h"
+#include "support/FaultyCalls.h"
 #include "support/TempFolder.h"
 #include "support/TestFiles.h"
 
@@ -155,6 +157,29 @@ TEST_F(FileProfilesTest, BatchesStoreOnceAtTheEndAndKeepOthersWrites) {
 
     EXPECT_EQ(Slurp(file_), "[S]\r\nc=3\r\nd=4\r\na=1\r\n");
     EXPECT_FALSE(profiles_.EndBatch(file_));
+
+    // A batch with a write the file refuses stores none of its writes.
+    profiles_.BeginBatch(file_);
+    EXPECT_TRUE(profiles_.WritePrivateProfileString("S", "e"s, "5"s, file_));
+    EXPECT_FALSE(profiles_.WritePrivateProfileString("S", "f"s, "two\nlines"s, file_));
+    EXPECT_FALSE(profiles_.EndBatch(file_));
+    EXPECT_EQ(Read(profiles_, file_, "e"), "none");
+    EXPECT_EQ(Slurp(file_), "[S]\r\nc=3\r\nd=4\r\na=1\r\n");
+}
+
+TEST_F(FileProfilesTest, AWriteTheDiskRefusesFailsAndKeepsTheFile) {
+    Spill(file_, "[S]\r\na=1\r\n");
+    test::FaultyCalls calls;
+    FileProfiles profiles(config_, calls);
+    calls.Fail(test::FaultyCalls::Call::Write, ENOSPC);
+    EXPECT_FALSE(profiles.WritePrivateProfileString("S", "a"s, "2"s, file_));
+    EXPECT_EQ(Read(profiles, file_, "a"), "1");
+    profiles.BeginBatch(file_);
+    EXPECT_TRUE(profiles.WritePrivateProfileString("S", "b"s, "3"s, file_));
+    calls.Fail(test::FaultyCalls::Call::Rename, EIO);
+    EXPECT_FALSE(profiles.EndBatch(file_));
+    EXPECT_EQ(Read(profiles, file_, "b"), "none");
+    EXPECT_EQ(Slurp(file_), "[S]\r\na=1\r\n");
 }
 
 TEST_F(FileProfilesTest, DamagedFilesAreNeverOverwritten) {

@@ -1,8 +1,8 @@
 #include "platform/posix/IniDocument.h"
 
-#include <gtest/gtest.h>
-
 #include <string>
+
+#include <gtest/gtest.h>
 
 namespace cv::posix {
 namespace {

@@ -2,10 +2,10 @@
 #include <sys/wait.h>
 #include <unistd.h>
 
-#include <gtest/gtest.h>
-
 #include <filesystem>
 #include <random>
+
+#include <gtest/gtest.h>
 
 #include "platform/posix/FileRegistry.h"
 #include "platform/posix/RegistryFile.h"
@@ -67,11 +67,11 @@ RegistryKey ReadWhole(const std::string& sPath) {
 std::string DataAt(const RegistryKey& cRoot, const std::string& sName, int32_t lType) {
     const RegistryKey* key = cRoot.Find({"Software", "Stress"});
     const RegistryValue* value = key == nullptr ? nullptr : key->Value(sName);
-    if (value == nullptr || value->Type != lType) {
+    if (value == nullptr || value->type != lType) {
         ADD_FAILURE() << sName << " missing";
         return {};
     }
-    return value->Data;
+    return value->data;
 }
 
 int32_t DwordAt(const RegistryKey& cRoot, const std::string& sName) {

@@ -1,8 +1,8 @@
 #include "platform/posix/RegistryFile.h"
 
-#include <gtest/gtest.h>
-
 #include <string>
+
+#include <gtest/gtest.h>
 
 namespace cv::posix {
 namespace {
@@ -109,7 +109,7 @@ TEST(RegistryFile, BadLinesCostOnlyThemselvesButAFileOfAnotherKindIsDamagedAsAWh
     const RegistryKey* two = root.Find(Path("Good\\Two"));
     ASSERT_NE(two, nullptr);
     ASSERT_EQ(two->Values().size(), 2u);
-    EXPECT_EQ(two->Value("long")->Data.size(), (10u << 20) + 1);
+    EXPECT_EQ(two->Value("long")->data.size(), (10u << 20) + 1);
     EXPECT_EQ(*two->Value("big"), Text(std::string(300, 'x')));
     EXPECT_EQ(root.SubKeyCount(), 1u) << "nothing under a malformed key line";
 

@@ -5,7 +5,7 @@
 #include <QPushButton>
 #include <QtTest>
 
-#include "app/FormUtility.h"
+#include "ui/widgets/FormUtility.h"
 
 class FormUtilityTest : public QObject {
     Q_OBJECT

@@ -1,9 +1,11 @@
+#include "util/TextToNumber.h"
+
 #include <cfloat>
 #include <cmath>
 #include <optional>
 
-#include "app/Utility.h"
 #include "platform/Locale.h"
+#include "platform/Platform.h"
 #include "platform/RegionalNumber.h"
 
 namespace cv {

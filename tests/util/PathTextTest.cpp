@@ -1,6 +1,6 @@
 #include <gtest/gtest.h>
 
-#include "app/Utility.h"
+#include "util/PathText.h"
 
 namespace cv {
 namespace {

@@ -1,4 +1,7 @@
-#include "app/FormUtility.h"
+#include "ui/widgets/FormUtility.h"
+
+#include <algorithm>
+#include <limits>
 
 #include <QComboBox>
 #include <QGroupBox>
@@ -9,8 +12,6 @@
 #include <QStringList>
 #include <QVariant>
 #include <QWidget>
-#include <algorithm>
-#include <limits>
 
 namespace cv {
 

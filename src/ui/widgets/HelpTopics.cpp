@@ -1,4 +1,8 @@
-#include "app/Utility.h"
+#include "ui/widgets/HelpTopics.h"
+
+#include <string>
+
+#include "platform/Platform.h"
 
 namespace cv {
 
@@ -23,25 +27,6 @@ void SetHelpPath(Platform& platform) {
 
 void ShowHelpTopic(Platform& platform, int32_t context) {
     platform.help.ShowTopic(platform.run.HelpFile, context);
-}
-
-std::string ComputerName(const Platform& platform) {
-    return platform.computer.Query().value_or(std::string());
-}
-
-std::string ProgramTitle() {
-    return "Corvalent OPC Test Client";
-}
-
-int32_t ProgramTunerKind() {
-    return 9;
-}
-
-bool UncertainWarningOff(Platform& platform, bool setFlag) {
-    if (setFlag) {
-        platform.run.UncertainWarningOff = true;
-    }
-    return platform.run.UncertainWarningOff;
 }
 
 }  // namespace cv

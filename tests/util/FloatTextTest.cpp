@@ -1,10 +1,11 @@
-#include <gtest/gtest.h>
-
 #include <cfloat>
 #include <cmath>
 
-#include "app/Utility.h"
+#include <gtest/gtest.h>
+
 #include "support/TestPlatform.h"
+#include "util/FloatText.h"
+#include "util/TextToNumber.h"
 
 namespace cv {
 namespace {
@@ -28,6 +29,8 @@ TEST(FormatFloat, WritesTheShortestTextThatReadsBack) {
     }
     EXPECT_EQ(FormatFloat(kComma, 1234.5, 4), "1234,5");
     EXPECT_EQ(FormatFloat(kComma, 1.0 / 3.0, 7), "0,33333334");
+    // Neither neighbour of a tie reads back, so more digits follow.
+    EXPECT_EQ(FormatFloat(kPoint, 654322.25, 7), "654322.25");
 }
 
 TEST(FormatFloat, TakesDigitsAsTheFewestAndSaturatesBeyondSingleRange) {

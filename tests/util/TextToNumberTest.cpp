@@ -1,7 +1,7 @@
 #include <gtest/gtest.h>
 
-#include "app/Utility.h"
 #include "support/TestPlatform.h"
+#include "util/TextToNumber.h"
 
 namespace cv {
 namespace {

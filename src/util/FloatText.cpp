@@ -1,8 +1,9 @@
+#include "util/FloatText.h"
+
 #include <algorithm>
 #include <cfloat>
 #include <cmath>
 
-#include "app/Utility.h"
 #include "platform/DecimalText.h"
 #include "platform/Locale.h"
 #include "platform/RegionalNumber.h"

@@ -1,4 +1,4 @@
-#include "app/Utility.h"
+#include "util/PathText.h"
 
 namespace cv {
 
