@@ -80,7 +80,8 @@ TEST_F(SimFaultTest, AHandlerMayReleaseTheServerAndGroupWhileTheirCallWaits) {
     Client other;
     Start(other, "Sim.Slow.1");
     other.server->SetShutDownHandler([&](const std::string&) { other.server.reset(); });
-    events.StartTimer(1000, false, [&] { plant.ShutDownServer("", "Sim.Slow.1", "bye"); });
+    events.StartTimer(1000, false,
+                      [&] { EXPECT_FALSE(plant.ShutDownServer("", "Sim.Slow.1", "bye")); });
     std::string text;
     EXPECT_EQ(other.server->GetErrorString(OPC_E_RANGE, text).Number, RPC_E_DISCONNECTED);
     EXPECT_EQ(other.server, nullptr);

@@ -133,7 +133,7 @@ TEST_F(SimGroupTest, TheRateIsRevisedUpToTheServersFastest) {
     EXPECT_EQ(group->SetUpdateRate(-1).Number, E_INVALIDARG);
     AddItem(*group, "Signals.Ramp");
     Subscribe(10);
-    group->UpdateRate(rate);
+    EXPECT_FALSE(group->UpdateRate(rate));
     EXPECT_EQ(rate, 50);
     events.Advance(1000);
     EXPECT_EQ(heard.Count(), 21u);

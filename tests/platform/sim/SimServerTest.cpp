@@ -41,12 +41,12 @@ TEST_F(SimServerTest, NameAndNodeAreWhatConnectWasGivenWhileConnected) {
     EXPECT_FALSE(server->ServerName(name));
     EXPECT_EQ(name, "") << "the probe right after creation";
     ASSERT_FALSE(server->Connect("sim.plant.1", "opchost1"));
-    server->ServerName(name);
-    server->ServerNode(node);
+    EXPECT_FALSE(server->ServerName(name));
+    EXPECT_FALSE(server->ServerNode(node));
     EXPECT_EQ(name + "|" + node, "sim.plant.1|opchost1");
     EXPECT_TRUE(server->Connect("Sim.Plant.1", "")) << "a second Connect must fail";
     EXPECT_FALSE(server->Disconnect());
-    server->ServerName(name);
+    EXPECT_FALSE(server->ServerName(name));
     EXPECT_EQ(name, "");
 }
 
