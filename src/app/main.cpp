@@ -1,33 +1,44 @@
 // The program: builds the production platform and shows the main window;
 // closing it ends the run.
 //
-//   cvopctestclient [--quit-when-shown] [Qt options]
+//   cvopctestclient [--plant FILE] [--quit-when-shown] [Qt options]
 //
+// --plant FILE       simulates the plant that FILE describes instead of the
+//                    built-in one (also CVOPCTESTCLIENT_PLANT=FILE)
 // --quit-when-shown  ends the program as soon as the main window has been
 //                    drawn for the first time (used to measure start-up).
 
 #include <cstdio>
 #include <cstdlib>
+#include <string>
 #include <string_view>
+#include <vector>
 
 #include <QApplication>
 
 #include "app/frmOpcTestClient.h"
 #include "platform/Platform.h"
+#include "platform/ServerCallWait.h"
+#include "platform/TraceLog.h"
 #include "platform/posix/FileProfiles.h"
 #include "platform/posix/FileRegistry.h"
 #include "platform/posix/HostComputerName.h"
 #include "platform/posix/PosixProgramInfo.h"
 #include "platform/qt/HelpWindow.h"
+#include "platform/qt/QtBusyNotice.h"
 #include "platform/qt/QtDialogs.h"
 #include "platform/qt/QtEventLoop.h"
 #include "platform/qt/QtLocale.h"
+#include "platform/sim/PlantLoader.h"
+#include "platform/sim/SimulatedPlant.h"
 #include "util/ProgramRoutines.h"
 
 namespace {
 
 constexpr const char* kUsage =
-    "usage: cvopctestclient [--quit-when-shown] [Qt options]\n"
+    "usage: cvopctestclient [--plant FILE] [--quit-when-shown] [Qt options]\n"
+    "  --plant FILE       simulate the plant FILE describes instead of the built-in one\n"
+    "                     (or set CVOPCTESTCLIENT_PLANT=FILE)\n"
     "  --quit-when-shown  end as soon as the main window has been drawn (start-up timing)\n";
 
 bool IsSet(const char* variable) {
@@ -62,6 +73,7 @@ class QuitWhenPainted : public QObject {
 }  // namespace
 
 int main(int argc, char** argv) {
+    const std::vector<std::string> arguments(argv + 1, argv + argc);
     bool quitWhenShown = false;
     for (int i = 1; i < argc; ++i) {
         const std::string_view argument(argv[i]);
@@ -91,8 +103,18 @@ int main(int argc, char** argv) {
     cv::posix::FileRegistry registry;
     cv::posix::FileProfiles profiles;
     cv::RunSwitches run;
-    cv::Platform platform{dialogs, locale,   program,  help, computer,
-                          events,  registry, profiles, run};
+    cv::qtui::QtBusyNotice busy(cv::ProgramTitle());
+    cv::platform::ServerCallWait serverCalls(events, busy);
+    const cv::sim::PlantChoice choice = cv::sim::ChoosePlant(
+        cv::sim::UserPlantFile(arguments, std::getenv(cv::sim::kPlantEnvironmentVariable)));
+    cv::sim::SimulatedPlant plant(choice.plant, serverCalls,
+                                  cv::sim::PlantOptions{computer.Query().value_or(""), {}});
+    cv::platform::TraceLog trace;
+    cv::Platform platform{dialogs,  locale,   program, help,  computer,    events,
+                          registry, profiles, run,     plant, serverCalls, trace};
+    if (!choice.message.empty()) {
+        dialogs.MsgBox(choice.message, cv::MsgBoxStyle::Exclamation, "");
+    }
 
     QuitWhenPainted quitter;
     cv::frmOpcTestClient window(platform);

@@ -11,6 +11,9 @@
 #include "platform/ProfileApi.h"
 #include "platform/ProgramInfo.h"
 #include "platform/RegistryApi.h"
+#include "platform/ServerCallWait.h"
+#include "platform/TraceLog.h"
+#include "platform/opc/OpcServerFactory.h"
 
 namespace cv {
 
@@ -40,6 +43,11 @@ struct Platform {
     platform::RegistryApi& registry;
     platform::ProfileApi& profiles;
     RunSwitches& run;
+    // OPC servers: the object factory, how calls into them wait, and the
+    // trace of what the OPC client did.
+    platform::OpcServerFactory& opc;
+    platform::ServerCallWait& serverCalls;
+    platform::TraceLog& trace;
 };
 
 }  // namespace cv
