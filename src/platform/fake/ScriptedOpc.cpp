@@ -16,6 +16,10 @@ ErrorInfo ScriptedOpc::CreateServer(std::unique_ptr<platform::OPCServer>& cServe
 
 ErrorInfo ScriptedOpc::Call(const std::string& name) {
     calls.push_back(name);
+    if (!interruptAt.empty() && name == interruptAt) {
+        interruptAt.clear();
+        interruption();
+    }
     const auto failure = failures.find(name);
     if (failure == failures.end()) {
         return {};

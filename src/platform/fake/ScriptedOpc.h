@@ -1,6 +1,7 @@
 #pragma once
 
 #include <cstdint>
+#include <functional>
 #include <map>
 #include <memory>
 #include <string>
@@ -17,7 +18,9 @@ namespace cv::fake {
 // gives that name. Items are always added; reads answer readValue and
 // readQuality for every item, or the error the script gives its server
 // handle, for at most answeredItems items when that is 0 or more. The
-// script must outlive the objects it creates.
+// first call named interruptAt runs interruption before it answers, as an
+// event would while the call waits. The script must outlive the objects it
+// creates.
 class ScriptedOpc : public platform::OpcServerFactory {
   public:
     ErrorInfo CreateServer(std::unique_ptr<platform::OPCServer>& cServer) override;
@@ -34,6 +37,8 @@ class ScriptedOpc : public platform::OpcServerFactory {
     int32_t readQuality = 0xC0;
     std::vector<Variant> written;
     int32_t nextServerHandle = 1;
+    std::string interruptAt;
+    std::function<void()> interruption;
 };
 
 }  // namespace cv::fake
