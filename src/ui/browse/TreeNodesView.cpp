@@ -1,5 +1,8 @@
 #include "ui/browse/TreeNodesView.h"
 
+#include <algorithm>
+#include <utility>
+
 #include <QList>
 #include <QTreeWidget>
 #include <QTreeWidgetItem>
@@ -66,23 +69,30 @@ void TreeNodesView::Flush() {
     const Raised syncing(syncing_);
     const std::vector<TreeNodes::Id> added = std::move(pending_);
     pending_.clear();
+    // Numbers only grow, so a parent numbered from the first one added is
+    // new too: its children join it before it goes into the control. The
+    // rest go in with one call for each parent already shown.
+    std::vector<std::pair<TreeNodes::Id, QList<QTreeWidgetItem*>>> shown;
     for (const TreeNodes::Id id : added) {
-        NewItem(id);
+        QTreeWidgetItem* item = NewItem(id);
+        const TreeNodes::Id parent = nodes_.Parent(id);
+        if (parent >= added.front()) {
+            ItemOf(parent)->addChild(item);
+            continue;
+        }
+        auto entry = std::find_if(shown.begin(), shown.end(),
+                                  [parent](const auto& e) { return e.first == parent; });
+        if (entry == shown.end()) {
+            entry = shown.insert(shown.end(), {parent, {}});
+        }
+        entry->second.append(item);
     }
-    // Brothers added one after the other go in together.
-    for (size_t first = 0; first < added.size();) {
-        const TreeNodes::Id parent = nodes_.Parent(added[first]);
-        QList<QTreeWidgetItem*> run;
-        size_t next = first;
-        for (; next < added.size() && nodes_.Parent(added[next]) == parent; ++next) {
-            run.append(ItemOf(added[next]));
-        }
+    for (auto& [parent, items] : shown) {
         if (parent == 0) {
-            tree_.addTopLevelItems(run);
+            tree_.addTopLevelItems(items);
         } else {
-            ItemOf(parent)->addChildren(run);
+            ItemOf(parent)->addChildren(items);
         }
-        first = next;
     }
 }
 

@@ -97,6 +97,7 @@ QGroupBox* frmOpcBrowse::CreateSelectedFrame() {
     lblAccessPath = Named(new QLabel(QStringLiteral("Access Paths :")), "lblAccessPath");
     cmbAccessPaths = Named(new QComboBox(), "cmbAccessPaths");
     cmbAccessPaths->setSizeAdjustPolicy(QComboBox::AdjustToContents);
+    cmbAccessPaths->setMinimumContentsLength(12);
     auto* grid = new QGridLayout(Frame1);
     grid->addWidget(Label2, 0, 0);
     grid->addWidget(lblItemID, 0, 1);
