@@ -255,15 +255,6 @@ TEST_F(OpcItemTreeTest, OKReportsOnlyAChange) {
     }
 }
 
-TEST_F(OpcItemTreeTest, ADoubleClickChoosesALeafOnly) {
-    Open("Sim.Plant.1", "Signals.Ramp");
-    EXPECT_TRUE(tree->DblClickChooses());
-    tree->NodeClick(Child("Signals"));
-    EXPECT_FALSE(tree->DblClickChooses());
-    tree->NodeClick(nodes.First());
-    EXPECT_FALSE(tree->DblClickChooses());
-}
-
 TEST_F(OpcItemTreeTest, ABranchIsFilledOnceAndASlowServerShowsTheBusyNotice) {
     Open("Sim.Slow.1");
     const TreeNodes::Id area = Child("Unit1");
@@ -310,12 +301,6 @@ TEST_F(OpcItemTreeTest, ABrowserThatStopsWorkingIsToldAndTheTreeStaysAsFilled) {
     EXPECT_EQ(tp.dialogs.Last().style, MsgBoxStyle::Exclamation);
     EXPECT_EQ(quiet.Code(), MousePointer::kDefault);
     EXPECT_EQ(again.Count(), 1) << "the root alone";
-}
-
-TEST_F(OpcItemTreeTest, UnloadingRemovesEveryNode) {
-    Open("Sim.Plant.1", "Area1.Unit1.FIC101.PV");
-    tree->Unload();
-    EXPECT_EQ(nodes.Count(), 0);
 }
 
 }  // namespace

@@ -63,34 +63,6 @@ TEST_F(OpcServerTreeTest, OpensWithThisComputerAndTheNetworkBelowTheTop) {
     EXPECT_TRUE(tp.dialogs.Messages().empty());
 }
 
-TEST_F(OpcServerTreeTest, CaptionsFollowTheMode) {
-    struct Case {
-        int32_t mode;
-        const char* caption;
-        const char* frame;
-        const char* label;
-        const char* top;
-    };
-    const Case cases[] = {
-        {BrowseMode::OpcServers, "Browse OPC Servers", "Selected Server",
-         "\\\\Node\\Server :", "M1 OPC Servers"},
-        {BrowseMode::OpcHdaServers, "Browse OPC HDA Servers", "Selected Server",
-         "\\\\Node\\Server :", "M1 OPC HDA Servers"},
-        {BrowseMode::NetworkComputers, "Browse network computers", "Selected computer",
-         "Computer :", "N1 Network Neighborhood"},
-    };
-    for (const Case& c : cases) {
-        SCOPED_TRACE(c.mode);
-        nodes.Clear();
-        Open(c.mode);
-        EXPECT_EQ(tree->Caption(), c.caption);
-        EXPECT_EQ(tree->FrameCaption(), c.frame);
-        EXPECT_EQ(tree->LabelCaption(), c.label);
-        const TreeNodes::Id top = nodes.First();
-        EXPECT_EQ(nodes.Key(top) + " " + nodes.Text(top), c.top);
-    }
-}
-
 TEST_F(OpcServerTreeTest, AServerOnThisComputerHandedInIsShownAndSelected) {
     Open(BrowseMode::OpcServers, "sim.slow.1");
     EXPECT_EQ(test::Dump(nodes),
@@ -284,13 +256,6 @@ TEST_F(OpcServerTreeTest, AFailingServerObjectEndsTheFillingQuietly) {
     Expand("C1");
     EXPECT_EQ(Under("C1"), "") << "the placeholder is gone: no retry";
     EXPECT_TRUE(tp.dialogs.Messages().empty());
-}
-
-TEST_F(OpcServerTreeTest, UnloadingRemovesEveryNode) {
-    Open(BrowseMode::OpcServers, "Sim.Plant.1");
-    tree->Unload();
-    EXPECT_EQ(nodes.Count(), 0);
-    EXPECT_EQ(nodes.Selected(), 0);
 }
 
 }  // namespace

@@ -137,39 +137,6 @@ class frmOpcBrowseTest : public QObject {
         QCOMPARE(tp->help.requests[0].context, 411);
     }
 
-    void doItReportsServersItCannotBrowseWithoutAWindow_data() {
-        QTest::addColumn<QString>("server");
-        QTest::addColumn<QString>("computer");
-        QTest::addColumn<QString>("message");
-        QTest::newRow("no server") << ""
-                                   << ""
-                                   << "Cannot connect to the OPC Server \"\" in this computer.\r\n"
-                                      "Error (0x0) - ";
-        QTest::newRow("locked out")
-            << "Sim.Plant.1"
-            << "SECURE1"
-            << "Cannot connect to the OPC Server \"Sim.Plant.1\" in computer \"\\\\SECURE1\".\r\n"
-               "Error (0x80070005) - Access is denied.";
-        QTest::newRow("no browser")
-            << "Sim.NoBrowse.1"
-            << ""
-            << "The OPC Server \"Sim.NoBrowse.1\" does not support browsing for Item names.";
-    }
-    void doItReportsServersItCannotBrowseWithoutAWindow() {
-        QFETCH(QString, server);
-        QFETCH(QString, computer);
-        std::string item = "A.B";
-        std::string path = "P";
-        QVERIFY(!cv::frmOpcBrowse::DoIt(tp->platform, server.toStdString(), computer.toStdString(),
-                                        item, path, false, false));
-        QCOMPARE(tp->dialogs.Messages().size(), size_t{1});
-        QFETCH(QString, message);
-        QCOMPARE(QString::fromStdString(tp->dialogs.Last().text), message);
-        QCOMPARE(item, std::string("A.B"));
-        QCOMPARE(path, std::string("P"));
-        QVERIFY(QApplication::overrideCursor() == nullptr);
-    }
-
     void doItHandsTheChoiceBackAndDisconnects() {
         std::string item = "Area1.Unit1.FIC101.PV";
         std::string path;
