@@ -230,5 +230,41 @@ TEST_F(DocumentOnline, TheExtraGroupComesAndGoesWithItsChannel) {
     }));
 }
 
+struct UncertainCase {
+    int32_t answer;
+    size_t questions;
+};
+
+// Yes keeps the warning but asks each channel once; No silences it for the
+// run. Going offline and online again asks nothing new.
+TEST_F(DocumentOnline, TheUncertainWarningComesOncePerChannelAndRun) {
+    const UncertainCase cases[] = {{MsgBoxResult::Yes, 2}, {MsgBoxResult::No, 1}};
+    for (const UncertainCase& c : cases) {
+        test::TestPlatform fresh;
+        TunFile doc(fresh.platform);
+        doc.SetDefaults(9);
+        for (int32_t n = 1; n <= 3; ++n) {
+            Channel& channel = *doc.Archives().Item(n);
+            channel.SetOpcServerID(kPlant);
+            channel.SetItemName(std::string(kLoop) + (n == 2 ? "OUT" : "SP"));
+        }
+        ASSERT_FALSE(fresh.plant.SetItemQuality("", kPlant, std::string(kLoop) + "SP", 0x40));
+        fresh.dialogs.QueueAnswer(c.answer);
+        fresh.dialogs.QueueAnswer(c.answer);
+        for (int run = 0; run < 2; ++run) {
+            ASSERT_TRUE(doc.GoOnline(true));
+            fresh.events.Advance(3000);
+            for (int read = 0; read < 2; ++read) {
+                EXPECT_EQ(doc.Archives().Item(1)->RawValue(), Variant::R8(50));
+                EXPECT_EQ(doc.Archives().Item(3)->RawValue(), Variant::R8(50));
+            }
+            doc.GoOffline();
+        }
+        EXPECT_EQ(fresh.dialogs.Messages().size(), c.questions);
+        EXPECT_EQ(fresh.dialogs.Messages()[0].title,
+                  doc.Archives().Item(1)->Description() + ": Uncertain OPC Value");
+    }
+}
+
 }  // namespace
 }  // namespace cv
