@@ -135,8 +135,9 @@ int main(int argc, char** argv) {
     cv::uaopc::UaBackend ua(serverCalls, uaOptions);
     cv::platform::RoutingServerFactory servers(plant, ua);
     cv::platform::TraceLog trace;
-    cv::Platform platform{dialogs,  locale,   program, help,    computer,    events,
-                          registry, profiles, run,     servers, serverCalls, trace};
+    cv::Platform platform{dialogs,     locale,   program,        help, computer,
+                          events,      registry, profiles,       run,  servers,
+                          serverCalls, trace,    plant.NetEnum()};
     if (!choice.message.empty()) {
         dialogs.MsgBox(choice.message, cv::MsgBoxStyle::Exclamation, "");
     }

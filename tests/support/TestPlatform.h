@@ -28,6 +28,7 @@ namespace cv::test {
 // simulated plant's on the virtual clock, starting at kStartDate, with this
 // computer named as the computer name says; OPC UA endpoint URLs would reach
 // real servers, and discovery is off, so listing servers asks no network.
+// The network is the plant's.
 struct TestPlatform {
     // 2025-01-01 00:00 local time.
     static constexpr double kStartDate = 45658.0;
@@ -59,8 +60,8 @@ struct TestPlatform {
                         }()};
     platform::RoutingServerFactory servers{plant, ua};
     platform::TraceLog trace;
-    Platform platform{dialogs,  locale,   program, help,    computer,    events,
-                      registry, profiles, run,     servers, serverCalls, trace};
+    Platform platform{dialogs,  locale, program, help,        computer, events,         registry,
+                      profiles, run,    servers, serverCalls, trace,    plant.NetEnum()};
 };
 
 }  // namespace cv::test

@@ -4,6 +4,7 @@
 #include <asio/connect.hpp>
 #include <asio/post.hpp>
 #include <asio/write.hpp>
+#include <iterator>
 
 #include "ua/services/ChannelServices.h"
 #include "ua/services/ServiceMessages.h"
@@ -464,7 +465,8 @@ void SecureChannel::Abort() {
     openDone_ = nullptr;
     lost_ = nullptr;
     pending_.clear();
-    outbox_.clear();
+    // A write in flight still owns the front buffer: its handler removes it.
+    outbox_.erase(writing_ ? std::next(outbox_.begin()) : outbox_.begin(), outbox_.end());
     asio::error_code ignored;
     resolver_.cancel();
     connectTimer_.cancel();
