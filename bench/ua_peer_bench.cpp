@@ -5,6 +5,11 @@
 //   per second and the client's CPU share (process CPU time over wall time;
 //   1.0 is one core), then the same workload received by node-opcua's own
 //   client (the anchor), measured the same way by its script.
+// - the same through the automation interface (the OPC UA backend on a real
+//   event loop): a server object's Connect (connect and session), adding a
+//   group (subscription), adding and activating one item, and its first
+//   notification; then 10,000 items in one group at a 100 ms update rate:
+//   time to the first notification of all, values per second, CPU share.
 // Needs Node.js and the installed peer (bash scripts/dev.sh test installs it).
 
 #include <benchmark/benchmark.h>
@@ -15,9 +20,16 @@
 #include <cstdio>
 #include <ctime>
 #include <fstream>
+#include <functional>
 #include <map>
+#include <memory>
 #include <sstream>
 
+#include "platform/ServerCallWait.h"
+#include "platform/fake/RecordingBusyNotice.h"
+#include "platform/opc/OpcResult.h"
+#include "platform/posix/SteadyEventLoop.h"
+#include "platform/ua/UaBackend.h"
 #include "ua/client/Client.h"
 #include "ua/support/DispatchQueue.h"
 
@@ -199,5 +211,158 @@ void BM_EndToEnd10000Items100msAnchor(benchmark::State& state) {
     }
 }
 BENCHMARK(BM_EndToEnd10000Items100msAnchor)->Iterations(1)->Unit(benchmark::kSecond);
+
+// The OPC UA backend as the program uses it, on a real event loop.
+struct Automation {
+    Automation() { wait.SetCallLimit(120'000); }
+
+    bool WaitUntil(const std::function<bool()>& done, uint32_t ms) {
+        return events.WaitUntil(done, ms);
+    }
+
+    cv::posix::SteadyEventLoop events;
+    cv::fake::RecordingBusyNotice busy;
+    cv::platform::ServerCallWait wait{events, busy};
+    cv::uaopc::UaBackend backend{wait};
+};
+
+using GroupPtr = std::shared_ptr<cv::platform::OPCGroup>;
+
+// Adds the bulk variables V0 to V<count-1> with client handles from 1;
+// false when any is refused.
+bool AddBulkItems(cv::platform::OPCGroup& group, uint32_t count) {
+    using cv::platform::OneBased;
+    OneBased<std::string> ids;
+    OneBased<std::string> paths;
+    OneBased<int32_t> clientHandles;
+    for (uint32_t i = 0; i < count; ++i) {
+        ids.Add("ns=1;s=Bulk.V" + std::to_string(i));
+        paths.Add("");
+        clientHandles.Add(static_cast<int32_t>(i + 1));
+    }
+    OneBased<int32_t> handles;
+    OneBased<int32_t> errors;
+    const auto n = static_cast<int32_t>(count);
+    if (group.OPCItems().AddItems(n, ids, clientHandles, paths, handles, errors)) {
+        return false;
+    }
+    for (int32_t i = 1; i <= n; ++i) {
+        if (errors(i) != 0) {
+            return false;
+        }
+    }
+    return true;
+}
+
+// An inactive, subscribed group at a 100 ms rate that counts the values
+// and the items heard from.
+GroupPtr CountingGroup(cv::platform::OPCServer& server, std::vector<bool>& seen, uint32_t& missing,
+                       uint64_t& values) {
+    GroupPtr group;
+    if (server.OPCGroups().Add("Bench", group) || group->SetIsActive(false) ||
+        group->SetUpdateRate(100)) {
+        return nullptr;
+    }
+    group->SetDataChangeHandler([&](const cv::platform::DataChangeArgs& args) {
+        values += static_cast<uint64_t>(args.NumItems);
+        for (int32_t i = 1; i <= args.NumItems; ++i) {
+            const auto handle = static_cast<size_t>(args.ClientHandles(i));
+            if (handle < seen.size() && !seen[handle]) {
+                seen[handle] = true;
+                --missing;
+            }
+        }
+    });
+    return group->SetIsSubscribed(true) ? nullptr : group;
+}
+
+void BM_AutomationFirstValueOfOneItem(benchmark::State& state) {
+    if (PeerUrl().empty()) {
+        state.SkipWithError("the peer did not start");
+        return;
+    }
+    Automation automation;
+    double connect = 0;
+    double subscription = 0;
+    double item = 0;
+    double first = 0;
+    for (auto _ : state) {
+        std::unique_ptr<cv::platform::OPCServer> server;
+        (void)automation.backend.CreateServer(server);
+        auto mark = std::chrono::steady_clock::now();
+        const auto lap = [&mark](double& total) {
+            total += Since(mark);
+            mark = std::chrono::steady_clock::now();
+        };
+        const auto start = mark;
+        if (server->Connect(PeerUrl(), "")) {
+            state.SkipWithError("connect failed");
+            return;
+        }
+        lap(connect);
+        std::vector<bool> seen(2);
+        uint32_t missing = 1;
+        uint64_t values = 0;
+        const GroupPtr group = CountingGroup(*server, seen, missing, values);
+        lap(subscription);
+        if (!group || !AddBulkItems(*group, 1) || group->SetIsActive(true)) {
+            state.SkipWithError("the group or its item failed");
+            return;
+        }
+        lap(item);
+        if (!automation.WaitUntil([&] { return missing == 0; }, 10'000)) {
+            state.SkipWithError("no first value");
+            return;
+        }
+        lap(first);
+        state.SetIterationTime(Since(start));
+        (void)server->Disconnect();
+    }
+    const auto perRun = [&state](double total) {
+        return total * 1000 / static_cast<double>(state.iterations());
+    };
+    state.counters["connect_session_ms"] = perRun(connect);
+    state.counters["subscription_ms"] = perRun(subscription);
+    state.counters["add_activate_ms"] = perRun(item);
+    state.counters["first_value_ms"] = perRun(first);
+}
+BENCHMARK(BM_AutomationFirstValueOfOneItem)->UseManualTime()->Unit(benchmark::kMillisecond);
+
+void BM_Automation10000Items100ms(benchmark::State& state) {
+    if (PeerUrl().empty()) {
+        state.SkipWithError("the peer did not start");
+        return;
+    }
+    Automation automation;
+    for (auto _ : state) {
+        std::unique_ptr<cv::platform::OPCServer> server;
+        (void)automation.backend.CreateServer(server);
+        std::vector<bool> seen(kItems + 1);
+        uint32_t missing = kItems;
+        uint64_t values = 0;
+        const GroupPtr group = server->Connect(PeerUrl(), "")
+                                   ? nullptr
+                                   : CountingGroup(*server, seen, missing, values);
+        const auto added = std::chrono::steady_clock::now();
+        if (!group || !AddBulkItems(*group, kItems) || group->SetIsActive(true) ||
+            !automation.WaitUntil([&] { return missing == 0; }, 120'000)) {
+            state.SkipWithError("not every item reported a value");
+            return;
+        }
+        const double firstAll = Since(added);
+        automation.WaitUntil([] { return false; }, 3'000);
+        const uint64_t valuesBefore = values;
+        const double cpuBefore = CpuSeconds();
+        const auto start = std::chrono::steady_clock::now();
+        automation.WaitUntil([] { return false; }, kSeconds * 1000);
+        const double wall = Since(start);
+        const double cpu = CpuSeconds() - cpuBefore;
+        state.counters["values_per_s"] = static_cast<double>(values - valuesBefore) / wall;
+        state.counters["cpu_share"] = cpu / wall;
+        state.counters["first_all_ms"] = firstAll * 1000;
+        (void)server->Disconnect();
+    }
+}
+BENCHMARK(BM_Automation10000Items100ms)->Iterations(1)->Unit(benchmark::kSecond);
 
 }  // namespace

@@ -7,6 +7,12 @@
 //                    built-in one (also CVOPCTESTCLIENT_PLANT=FILE)
 // --quit-when-shown  ends the program as soon as the main window has been
 //                    drawn for the first time (used to measure start-up).
+//
+// Server IDs that are OPC UA endpoint URLs (opc.tcp://host:port/path) go to
+// OPC UA servers, all others to the simulated plant. OPC UA servers are
+// found at a computer's discovery port: CVOPCTESTCLIENT_UA_DISCOVERY_PORT,
+// else the user's setting UaDiscoveryPort (HKEY_CURRENT_USER
+// Software\Corvalent\TestClient), else 4840.
 
 #include <cstdio>
 #include <cstdlib>
@@ -20,6 +26,7 @@
 #include "platform/Platform.h"
 #include "platform/ServerCallWait.h"
 #include "platform/TraceLog.h"
+#include "platform/opc/RoutingServerFactory.h"
 #include "platform/posix/FileProfiles.h"
 #include "platform/posix/FileRegistry.h"
 #include "platform/posix/HostComputerName.h"
@@ -33,6 +40,8 @@
 #include "platform/sim/PlantLoader.h"
 #include "platform/sim/SimDdeServers.h"
 #include "platform/sim/SimulatedPlant.h"
+#include "platform/ua/UaBackend.h"
+#include "stores/RegClass.h"
 #include "util/ProgramRoutines.h"
 
 namespace {
@@ -58,6 +67,18 @@ bool HasDisplay(int argc, char** argv) {
         }
     }
     return IsSet("DISPLAY") || IsSet("WAYLAND_DISPLAY") || IsSet("QT_QPA_PLATFORM");
+}
+
+// Where OPC UA discovery asks a computer for its servers.
+uint16_t DiscoveryPort(cv::platform::RegistryApi& registry) {
+    if (const auto port = cv::uaopc::PortFromText(std::getenv(cv::uaopc::kDiscoveryPortVariable))) {
+        return *port;
+    }
+    cv::RegClass settings(registry);
+    settings.SetMainKey(cv::platform::kHkeyCurrentUser);
+    return static_cast<uint16_t>(settings.ReadLong("Software\\Corvalent\\TestClient",
+                                                   "UaDiscoveryPort",
+                                                   cv::uaopc::kDefaultDiscoveryPort, 1, 65535));
 }
 
 // Ends the event loop after the watched window's first paint.
@@ -111,11 +132,15 @@ int main(int argc, char** argv) {
         cv::sim::UserPlantFile(arguments, std::getenv(cv::sim::kPlantEnvironmentVariable)));
     cv::sim::SimulatedPlant plant(choice.plant, serverCalls,
                                   cv::sim::PlantOptions{computer.Query().value_or(""), {}});
+    cv::uaopc::UaOptions uaOptions;
+    uaOptions.discoveryPort = DiscoveryPort(registry);
+    cv::uaopc::UaBackend ua(serverCalls, uaOptions);
+    cv::platform::RoutingServerFactory servers(plant, ua);
     cv::platform::TraceLog trace;
     cv::qtui::QtModelessMessages modeless(cv::ProgramTitle());
     cv::Platform platform{
         dialogs,  locale, program, help,        computer, events,          registry,
-        profiles, run,    plant,   serverCalls, trace,    plant.NetEnum(), plant.DdeServers(),
+        profiles, run,    servers, serverCalls, trace,    plant.NetEnum(), plant.DdeServers(),
         modeless};
     if (!choice.message.empty()) {
         dialogs.MsgBox(choice.message, cv::MsgBoxStyle::Exclamation, "");

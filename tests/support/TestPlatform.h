@@ -10,11 +10,13 @@
 #include "platform/fake/RecordingHelp.h"
 #include "platform/fake/ScriptedDialogs.h"
 #include "platform/fake/VirtualEventLoop.h"
+#include "platform/opc/RoutingServerFactory.h"
 #include "platform/posix/FileProfiles.h"
 #include "platform/posix/FileRegistry.h"
 #include "platform/sim/PlantLoader.h"
 #include "platform/sim/SimDdeServers.h"
 #include "platform/sim/SimulatedPlant.h"
+#include "platform/ua/UaBackend.h"
 #include "support/RecordingModeless.h"
 #include "support/TempFolder.h"
 
@@ -24,9 +26,11 @@ namespace cv::test {
 // pinned locale (point decimal unless the test asks for the comma one) and a
 // clock that moves only by hand. The registry and the profile files are the
 // real ones, kept in a fresh temporary folder that goes with the object. OPC
-// servers, DDE applications and the network are the built-in simulated plant on the virtual
-// clock, starting at kStartDate, with this computer named as the computer
-// name says.
+// servers go through the program's router: server IDs are the built-in
+// simulated plant's on the virtual clock, starting at kStartDate, with this
+// computer named as the computer name says; OPC UA endpoint URLs would reach
+// real servers, and discovery is off, so listing servers asks no network.
+// The network and the DDE applications are the plant's.
 struct TestPlatform {
     // 2025-01-01 00:00 local time.
     static constexpr double kStartDate = 45658.0;
@@ -51,11 +55,17 @@ struct TestPlatform {
     platform::ServerCallWait serverCalls{events, busy};
     sim::SimulatedPlant plant{sim::BuiltInPlant(), serverCalls,
                               sim::PlantOptions{computer.name.value_or(""), kStartDate}};
+    uaopc::UaBackend ua{serverCalls, [] {
+                            uaopc::UaOptions options;
+                            options.discoveryPort = 0;
+                            return options;
+                        }()};
+    platform::RoutingServerFactory servers{plant, ua};
     platform::TraceLog trace;
     RecordingModeless modeless;
     Platform platform{
         dialogs,  locale, program, help,        computer, events,          registry,
-        profiles, run,    plant,   serverCalls, trace,    plant.NetEnum(), plant.DdeServers(),
+        profiles, run,    servers, serverCalls, trace,    plant.NetEnum(), plant.DdeServers(),
         modeless};
 };
 

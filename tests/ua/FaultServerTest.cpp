@@ -11,7 +11,8 @@ using Script = ScriptedServer::Script;
 using Request = ScriptedServer::Request;
 
 // A client of the scripted server with short time-outs (real ones: the
-// tests wait for completions, never for time).
+// tests wait for completions, never for time). A broken connection ends the
+// session here; resuming it is tested on its own.
 class Scripted {
   public:
     explicit Scripted(Script script, ClientOptions options = Options())
@@ -26,6 +27,7 @@ class Scripted {
         ClientOptions options;
         options.requestTimeoutMs = 200;
         options.channel.connectTimeoutMs = 200;
+        options.resumeSessions = false;
         return options;
     }
 

@@ -39,6 +39,8 @@ class ScriptedOpc : public platform::OpcServerFactory {
     int32_t nextServerHandle = 1;
     std::string interruptAt;
     std::function<void()> interruption;
+    // What the server objects answer to BackendName.
+    std::string backendName = "scripted";
 };
 
 }  // namespace cv::fake

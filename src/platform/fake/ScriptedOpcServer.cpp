@@ -50,6 +50,10 @@ ErrorInfo ScriptedOpcServer::Disconnect() {
     return script_.Call("Disconnect");
 }
 
+std::string ScriptedOpcServer::BackendName() const {
+    return script_.backendName;
+}
+
 ErrorInfo ScriptedOpcServer::Add(const std::string& sName,
                                  std::shared_ptr<platform::OPCGroup>& cGroup) {
     if (ErrorInfo error = script_.Call("Add")) {

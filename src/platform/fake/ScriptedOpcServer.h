@@ -27,6 +27,7 @@ class ScriptedOpcServer : public platform::OPCServer, public platform::OPCGroups
     ErrorInfo GetErrorString(int32_t lError, std::string& sText) override;
     ErrorInfo Disconnect() override;
     void SetShutDownHandler(ShutDownHandler handler) override { handler_ = std::move(handler); }
+    std::string BackendName() const override;
 
     int32_t Count() const override { return static_cast<int32_t>(groups_.size()); }
     ErrorInfo Add(const std::string& sName, std::shared_ptr<platform::OPCGroup>& cGroup) override;

@@ -40,8 +40,12 @@ class OPCServer {
     virtual ErrorInfo CreateBrowser(std::shared_ptr<OPCBrowser>& cBrowser) = 0;
     virtual ErrorInfo GetErrorString(int32_t lError, std::string& sText) = 0;
     virtual ErrorInfo Disconnect() = 0;
-    // Fires from the event loop when the server announces that it goes down.
+    // Fires from the event loop when the server announces that it goes down
+    // or is lost for good.
     virtual void SetShutDownHandler(ShutDownHandler handler) = 0;
+    // Which kind of server this object talks to, in words for the user
+    // ("simulated plant", "OPC UA"); empty while that is not known yet.
+    virtual std::string BackendName() const = 0;
 };
 
 }  // namespace cv::platform

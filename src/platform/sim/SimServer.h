@@ -29,6 +29,9 @@ class SimServer : public platform::OPCServer {
     ErrorInfo GetErrorString(int32_t lError, std::string& sText) override;
     ErrorInfo Disconnect() override;
     void SetShutDownHandler(ShutDownHandler handler) override;
+    std::string BackendName() const override { return kBackendName; }
+
+    static constexpr const char* kBackendName = "simulated plant";
 
   private:
     std::shared_ptr<Connection> connection_;

@@ -125,6 +125,15 @@ void Client::CreateMonitoredItems(uint32_t subscriptionId, TimestampsToReturn ti
     });
 }
 
+void Client::ModifyMonitoredItems(uint32_t subscriptionId, TimestampsToReturn timestamps,
+                                  std::vector<MonitoredItemModifyRequest> items,
+                                  Callback<std::vector<MonitoredItemModifyResult>> done) {
+    Run([subscriptionId, timestamps, items = std::move(items),
+         done = std::move(done)](ClientCore& core) mutable {
+        core.ModifyMonitoredItems(subscriptionId, timestamps, std::move(items), std::move(done));
+    });
+}
+
 void Client::SetMonitoringMode(uint32_t subscriptionId, MonitoringMode mode,
                                std::vector<uint32_t> monitoredItemIds,
                                Callback<std::vector<StatusCode>> done) {

@@ -43,8 +43,9 @@ class Client {
     Client(const Client&) = delete;
     Client& operator=(const Client&) = delete;
 
-    // Told when the server announces its shutdown or the connection is lost
-    // for good. Set it before Connect.
+    // Told when the server announces its shutdown, when the connection
+    // breaks and when the session is resumed on a new one, and when the
+    // connection is lost for good. Set it before Connect.
     void SetEventHandler(EventHandler handler);
 
     // Opens a secure channel (SecurityPolicy None) and an anonymous session.
@@ -88,6 +89,10 @@ class Client {
     void CreateMonitoredItems(uint32_t subscriptionId, TimestampsToReturn timestamps,
                               std::vector<MonitoredItemCreateRequest> items,
                               Callback<std::vector<MonitoredItemCreateResult>> done);
+    // Changes the sampling interval, queue or filter of monitored items.
+    void ModifyMonitoredItems(uint32_t subscriptionId, TimestampsToReturn timestamps,
+                              std::vector<MonitoredItemModifyRequest> items,
+                              Callback<std::vector<MonitoredItemModifyResult>> done);
     void SetMonitoringMode(uint32_t subscriptionId, MonitoringMode mode,
                            std::vector<uint32_t> monitoredItemIds,
                            Callback<std::vector<StatusCode>> done);
@@ -95,12 +100,14 @@ class Client {
                               Callback<std::vector<StatusCode>> done);
 
     // For tests and diagnostics: security tokens the current channel has
-    // received (1 before any renewal), Publish requests at the server, and
-    // notification messages fetched again with Republish.
+    // received (1 before any renewal), Publish requests at the server,
+    // notification messages fetched again with Republish, and times the
+    // session was resumed on a new connection.
     struct Statistics {
         uint32_t securityTokens = 0;
         uint32_t outstandingPublishes = 0;
         uint64_t republished = 0;
+        uint32_t resumes = 0;
     };
     void GetStatistics(std::function<void(Statistics)> done);
 

@@ -41,6 +41,8 @@ void ClientCore::Connect(const std::string& sEndpointUrl, Callback<SessionInfo> 
 void ClientCore::OnEvent(ConnectionEvent event, const Error& reason) {
     if (event == ConnectionEvent::ConnectionLost) {
         engine_->Stop();
+    } else if (event == ConnectionEvent::Resumed) {
+        engine_->Resume();
     }
     if (events_) {
         deliver_([handler = events_, event, reason] { handler(event, reason); });
@@ -284,6 +286,17 @@ void ClientCore::CreateMonitoredItems(uint32_t subscriptionId, TimestampsToRetur
     Operate(std::move(request), count, &CreateMonitoredItemsResponse::results, std::move(done));
 }
 
+void ClientCore::ModifyMonitoredItems(uint32_t subscriptionId, TimestampsToReturn timestamps,
+                                      std::vector<MonitoredItemModifyRequest> items,
+                                      Callback<std::vector<MonitoredItemModifyResult>> done) {
+    ModifyMonitoredItemsRequest request;
+    request.subscriptionId = subscriptionId;
+    request.timestampsToReturn = timestamps;
+    const size_t count = items.size();
+    request.itemsToModify = std::move(items);
+    Operate(std::move(request), count, &ModifyMonitoredItemsResponse::results, std::move(done));
+}
+
 void ClientCore::SetMonitoringMode(uint32_t subscriptionId, MonitoringMode mode,
                                    std::vector<uint32_t> monitoredItemIds,
                                    Callback<std::vector<StatusCode>> done) {
@@ -306,7 +319,8 @@ void ClientCore::DeleteMonitoredItems(uint32_t subscriptionId,
 }
 
 Client::Statistics ClientCore::Statistics() const {
-    return {session_->TokenCount(), engine_->OutstandingPublishes(), engine_->Republished()};
+    return {session_->TokenCount(), engine_->OutstandingPublishes(), engine_->Republished(),
+            session_->Resumes()};
 }
 
 }  // namespace cv::ua

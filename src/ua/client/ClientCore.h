@@ -52,6 +52,9 @@ class ClientCore : public std::enable_shared_from_this<ClientCore> {
     void CreateMonitoredItems(uint32_t subscriptionId, TimestampsToReturn timestamps,
                               std::vector<MonitoredItemCreateRequest> items,
                               Callback<std::vector<MonitoredItemCreateResult>> done);
+    void ModifyMonitoredItems(uint32_t subscriptionId, TimestampsToReturn timestamps,
+                              std::vector<MonitoredItemModifyRequest> items,
+                              Callback<std::vector<MonitoredItemModifyResult>> done);
     void SetMonitoringMode(uint32_t subscriptionId, MonitoringMode mode,
                            std::vector<uint32_t> monitoredItemIds,
                            Callback<std::vector<StatusCode>> done);

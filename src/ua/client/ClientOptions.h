@@ -26,6 +26,10 @@ struct ClientOptions {
     uint32_t keepAliveIntervalMs = 5'000;
     // Publish requests kept at the server while subscriptions exist.
     uint32_t publishRequests = 4;
+    // A connection that breaks is opened again and the session resumed on
+    // it, for as long as the server keeps the session (its revised session
+    // time-out, counted from the break).
+    bool resumeSessions = true;
 };
 
 }  // namespace cv::ua

@@ -40,15 +40,38 @@ const UserTokenPolicy* AnonymousPolicy(const EndpointDescription& endpoint) {
 }  // namespace
 
 Session::Session(asio::io_context& io, const ClientOptions& options, EventHandler events)
-    : io_(io), options_(options), events_(std::move(events)), keepAliveTimer_(io) {}
+    : io_(io),
+      options_(options),
+      events_(std::move(events)),
+      keepAliveTimer_(io),
+      resumeTimer_(io) {}
 
 bool Session::IsSessionGone(StatusCode status) {
     return status == status::BadSessionIdInvalid || status == status::BadSessionClosed ||
-           status == status::BadSessionNotActivated;
+           status == status::BadSessionNotActivated || status == status::BadShutdown ||
+           status == status::BadServerHalted;
 }
 
 void Session::Connect(const std::string& sEndpointUrl,
                       std::function<void(Result<SessionInfo>)> done) {
+    info_ = {};
+    info_.endpointUrl = sEndpointUrl;
+    OpenChannel(sEndpointUrl,
+                [weak = weak_from_this(), done = std::move(done)](Result<Done> opened) {
+                    auto self = weak.lock();
+                    if (!self) {
+                        return;
+                    }
+                    if (!opened) {
+                        done(opened.Failure());
+                        return;
+                    }
+                    self->CreateSession(std::move(done));
+                });
+}
+
+void Session::OpenChannel(const std::string& sEndpointUrl,
+                          std::function<void(Result<Done>)> opened) {
     channel_ = std::make_shared<SecureChannel>(io_, options_.channel,
                                                std::make_unique<NoneSecurityPolicy>());
     channel_->SetLostHandler([weak = weak_from_this()](const Error& reason) {
@@ -56,20 +79,7 @@ void Session::Connect(const std::string& sEndpointUrl,
             self->Lose(reason);
         }
     });
-    info_ = {};
-    info_.endpointUrl = sEndpointUrl;
-    channel_->Open(sEndpointUrl,
-                   [weak = weak_from_this(), done = std::move(done)](Result<Done> opened) {
-                       auto self = weak.lock();
-                       if (!self) {
-                           return;
-                       }
-                       if (!opened) {
-                           done(opened.Failure());
-                           return;
-                       }
-                       self->CreateSession(std::move(done));
-                   });
+    channel_->Open(sEndpointUrl, std::move(opened));
 }
 
 void Session::CreateSession(std::function<void(Result<SessionInfo>)> done) {
@@ -193,6 +203,10 @@ void Session::Lose(const Error& reason) {
     active_ = false;
     keepAliveTimer_.cancel();
     channel_->Close();
+    if (options_.resumeSessions && !shutdownAnnounced_ && !EndsTheSession(reason.status)) {
+        StartResume(reason);
+        return;
+    }
     if (events_) {
         events_(ConnectionEvent::ConnectionLost, reason);
     }
@@ -200,6 +214,11 @@ void Session::Lose(const Error& reason) {
 
 void Session::Close(std::function<void()> done) {
     keepAliveTimer_.cancel();
+    if (resuming_) {
+        resuming_ = false;
+        resumeTimer_.cancel();
+        FailParked(Error{status::BadSessionClosed, "The session was closed."});
+    }
     if (!active_) {
         if (channel_) {
             channel_->Close();
@@ -221,8 +240,11 @@ void Session::Close(std::function<void()> done) {
 
 void Session::Abort() {
     active_ = false;
+    resuming_ = false;
     events_ = nullptr;
     keepAliveTimer_.cancel();
+    resumeTimer_.cancel();
+    parked_.clear();
     if (channel_) {
         channel_->Abort();
     }

@@ -2,10 +2,13 @@
 
 #include <asio/io_context.hpp>
 #include <asio/steady_timer.hpp>
+#include <chrono>
 #include <cstdint>
 #include <functional>
+#include <map>
 #include <memory>
 #include <string>
+#include <string_view>
 
 #include "ua/client/ClientOptions.h"
 #include "ua/client/ServiceCall.h"
@@ -20,6 +23,13 @@ namespace cv::ua {
 // calls carrying the session's token, a keep-alive read of the server's
 // state (which also notices an announced shutdown), CloseSession. Lives on
 // the I/O thread.
+//
+// When the channel breaks, the session is resumed on a new one (a new
+// channel, then ActivateSession with the same token) until the session
+// time-out has passed since the break; calls made meanwhile wait for it,
+// each within its own time-out (Session_resume.cpp). A server that
+// announced its shutdown, said it is halting, or no longer knows the
+// session ends it for good.
 class Session : public std::enable_shared_from_this<Session> {
   public:
     using EventHandler = std::function<void(ConnectionEvent, const Error&)>;
@@ -31,6 +41,10 @@ class Session : public std::enable_shared_from_this<Session> {
     template <class Request, class Response>
     void Call(Request request, std::function<void(Result<Response>)> done, uint32_t timeoutMs = 0) {
         if (!active_) {
+            if (resuming_) {
+                Park(std::move(request), std::move(done), timeoutMs);
+                return;
+            }
             asio::post(io_, [done = std::move(done)] {
                 done(Error{status::BadSessionClosed, "There is no open session."});
             });
@@ -50,13 +64,47 @@ class Session : public std::enable_shared_from_this<Session> {
     bool IsActive() const { return active_; }
     const SessionInfo& Info() const { return info_; }
     uint32_t TokenCount() const { return channel_ ? channel_->TokenCount() : 0; }
+    // Times the session was resumed on a new channel.
+    uint32_t Resumes() const { return resumes_; }
 
   private:
+    // A call made while the session is being resumed.
+    struct Parked {
+        std::function<void()> send;
+        std::function<void(const Error&)> fail;
+        std::unique_ptr<asio::steady_timer> timer;
+    };
+
+    void OpenChannel(const std::string& sEndpointUrl, std::function<void(Result<Done>)> opened);
     void CreateSession(std::function<void(Result<SessionInfo>)> done);
     void ActivateSession(std::function<void(Result<SessionInfo>)> done);
     void StartKeepAlive();
     void OnKeepAlive(Result<ReadResponse> response);
     void Lose(const Error& reason);
+    // Session_resume.cpp
+    static bool EndsTheSession(StatusCode status);
+    void StartResume(const Error& reason);
+    void TryResume();
+    void OnResumeFailed(const Error& failure);
+    void OnResumed();
+    void EndForGood(const Error& reason);
+    template <class Request, class Response>
+    void Park(Request request, std::function<void(Result<Response>)> done, uint32_t timeoutMs) {
+        auto shared = std::make_shared<std::function<void(Result<Response>)>>(std::move(done));
+        Park(
+            [weak = weak_from_this(), request = std::move(request), shared, timeoutMs]() mutable {
+                if (auto self = weak.lock()) {
+                    self->Call<Request, Response>(std::move(request), std::move(*shared),
+                                                  timeoutMs);
+                }
+            },
+            [shared](const Error& error) { (*shared)(error); },
+            timeoutMs ? timeoutMs : options_.requestTimeoutMs, ServiceName(Request::kEncodingId));
+    }
+    void Park(std::function<void()> send, std::function<void(const Error&)> fail,
+              uint32_t timeoutMs, std::string_view service);
+    void SendParked();
+    void FailParked(const Error& reason);
 
     // Passes a response on, and treats a session the server no longer knows
     // as the end of the connection.
@@ -82,6 +130,15 @@ class Session : public std::enable_shared_from_this<Session> {
     bool active_ = false;
     bool shutdownAnnounced_ = false;
     SessionInfo info_;
+    // Resuming after a broken channel.
+    bool resuming_ = false;
+    Error lostReason_;
+    std::chrono::steady_clock::time_point resumeDeadline_;
+    uint32_t resumeAttempts_ = 0;
+    uint32_t resumes_ = 0;
+    asio::steady_timer resumeTimer_;
+    std::map<uint64_t, Parked> parked_;
+    uint64_t lastParked_ = 0;
 };
 
 }  // namespace cv::ua

@@ -22,6 +22,12 @@ enum class ConnectionEvent {
     ServerShutdown,
     // The connection or the session is gone for good; the error says why.
     ConnectionLost,
+    // The connection broke; the client is opening a new one to resume the
+    // same session. Calls made meanwhile wait for it. The error says why.
+    Interrupted,
+    // The session goes on over a new connection; its subscriptions continue
+    // and missed notifications are fetched again.
+    Resumed,
 };
 
 }  // namespace cv::ua

@@ -133,12 +133,21 @@ void SubscriptionEngine::Publish() {
     request.subscriptionAcknowledgements = std::move(acknowledgements_);
     acknowledgements_.clear();
     ++outstanding_;
+    // A request that fails took its acknowledgements nowhere: they go with
+    // the next one.
     session_->Call<PublishRequest, PublishResponse>(
-        std::move(request),
-        [weak = weak_from_this()](Result<PublishResponse> response) {
-            if (auto self = weak.lock()) {
-                self->OnPublish(std::move(response));
+        request,
+        [weak = weak_from_this(),
+         acknowledged = request.subscriptionAcknowledgements](Result<PublishResponse> response) {
+            auto self = weak.lock();
+            if (!self) {
+                return;
             }
+            if (!response && !self->stopped_) {
+                self->acknowledgements_.insert(self->acknowledgements_.end(), acknowledged.begin(),
+                                               acknowledged.end());
+            }
+            self->OnPublish(std::move(response));
         },
         PublishTimeoutMs());
 }

@@ -34,6 +34,8 @@ class SubscriptionEngine : public std::enable_shared_from_this<SubscriptionEngin
                 std::function<void(Result<std::vector<StatusCode>>)> done);
     // Forgets every subscription and stops publishing.
     void Stop();
+    // The session was resumed on a new connection: publishing goes on.
+    void Resume() { Fill(); }
 
     uint32_t OutstandingPublishes() const { return outstanding_; }
     uint64_t Republished() const { return republished_; }

@@ -87,6 +87,62 @@ struct CreateMonitoredItemsResponse {
     }
 };
 
+struct MonitoredItemModifyRequest {
+    uint32_t monitoredItemId = 0;
+    MonitoringParameters requestedParameters;
+
+    template <class S, class V>
+    static void Visit(S& s, V& v) {
+        v(s.monitoredItemId);
+        v(s.requestedParameters);
+    }
+};
+
+struct MonitoredItemModifyResult {
+    StatusCode statusCode;
+    double revisedSamplingInterval = 0;
+    uint32_t revisedQueueSize = 0;
+    ExtensionObject filterResult;
+
+    template <class S, class V>
+    static void Visit(S& s, V& v) {
+        v(s.statusCode);
+        v(s.revisedSamplingInterval);
+        v(s.revisedQueueSize);
+        v(s.filterResult);
+    }
+};
+
+struct ModifyMonitoredItemsRequest {
+    static constexpr uint16_t kEncodingId = 763;
+    RequestHeader header;
+    uint32_t subscriptionId = 0;
+    TimestampsToReturn timestampsToReturn = TimestampsToReturn::Both;
+    std::vector<MonitoredItemModifyRequest> itemsToModify;
+
+    template <class S, class V>
+    static void Visit(S& s, V& v) {
+        v(s.header);
+        v(s.subscriptionId);
+        v(s.timestampsToReturn);
+        v(s.itemsToModify);
+    }
+};
+
+struct ModifyMonitoredItemsResponse {
+    static constexpr uint16_t kEncodingId = 766;
+    ResponseHeader header;
+    std::vector<MonitoredItemModifyResult> results;
+    std::vector<DiagnosticInfo> diagnosticInfos;
+
+    template <class S, class V>
+    static void Visit(S& s, V& v) {
+        v(s.header);
+        v(s.results);
+        v(s.diagnosticInfos);
+    }
+};
+
 struct SetMonitoringModeRequest {
     static constexpr uint16_t kEncodingId = 769;
     RequestHeader header;

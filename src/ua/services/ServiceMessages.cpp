@@ -8,7 +8,7 @@
 namespace cv::ua {
 namespace {
 
-constexpr std::array<std::pair<uint16_t, std::string_view>, 20> kServices = {{
+constexpr std::array<std::pair<uint16_t, std::string_view>, 21> kServices = {{
     {422, "FindServers"},
     {428, "GetEndpoints"},
     {446, "OpenSecureChannel"},
@@ -22,6 +22,7 @@ constexpr std::array<std::pair<uint16_t, std::string_view>, 20> kServices = {{
     {631, "Read"},
     {673, "Write"},
     {751, "CreateMonitoredItems"},
+    {763, "ModifyMonitoredItems"},
     {769, "SetMonitoringMode"},
     {781, "DeleteMonitoredItems"},
     {787, "CreateSubscription"},
