@@ -8,6 +8,7 @@
 #include <string>
 
 #include "ua/client/ClientOptions.h"
+#include "ua/client/ConnectOptions.h"
 #include "ua/client/ServiceCall.h"
 #include "ua/client/SessionInfo.h"
 #include "ua/services/AttributeServices.h"
@@ -16,17 +17,21 @@
 namespace cv::ua {
 
 // A session over its own secure channel: CreateSession with a fresh random
-// nonce, ActivateSession with the endpoint's anonymous policy, typed service
-// calls carrying the session's token, a keep-alive read of the server's
-// state (which also notices an announced shutdown), CloseSession. Lives on
-// the I/O thread.
+// nonce, ActivateSession with the user's identity token, typed service calls
+// carrying the session's token, a keep-alive read of the server's state
+// (which also notices an announced shutdown), CloseSession. On a secured
+// endpoint the channel signs (and encrypts) with the program's certificate,
+// the server's session signature is checked against the certificate the
+// endpoint showed, and ActivateSession carries the program's signature.
+// Lives on the I/O thread.
 class Session : public std::enable_shared_from_this<Session> {
   public:
     using EventHandler = std::function<void(ConnectionEvent, const Error&)>;
 
     Session(asio::io_context& io, const ClientOptions& options, EventHandler events);
 
-    void Connect(const std::string& sEndpointUrl, std::function<void(Result<SessionInfo>)> done);
+    void Connect(const std::string& sEndpointUrl, ConnectOptions connect,
+                 std::function<void(Result<SessionInfo>)> done);
 
     template <class Request, class Response>
     void Call(Request request, std::function<void(Result<Response>)> done, uint32_t timeoutMs = 0) {
@@ -53,7 +58,13 @@ class Session : public std::enable_shared_from_this<Session> {
 
   private:
     void CreateSession(std::function<void(Result<SessionInfo>)> done);
+    Result<Done> OnCreated(const CreateSessionResponse& created);
+    Result<EndpointDescription> ServerEndpoint(const CreateSessionResponse& created) const;
     void ActivateSession(std::function<void(Result<SessionInfo>)> done);
+    Result<ActivateSessionRequest> MakeActivateRequest() const;
+    bool Secured() const {
+        return connect_.endpoint && connect_.endpoint->securityMode != MessageSecurityMode::None;
+    }
     void StartKeepAlive();
     void OnKeepAlive(Result<ReadResponse> response);
     void Lose(const Error& reason);
@@ -77,6 +88,10 @@ class Session : public std::enable_shared_from_this<Session> {
     EventHandler events_;
     std::shared_ptr<SecureChannel> channel_;
     asio::steady_timer keepAliveTimer_;
+    ConnectOptions connect_;
+    ByteString clientNonce_;
+    ByteString serverNonce_;
+    ByteString serverCertificate_;
     NodeId authenticationToken_;
     uint32_t lastRequestHandle_ = 0;
     bool active_ = false;
