@@ -53,9 +53,11 @@ inline const crypto::Credentials& LargeKeyCredentials() {
 }
 
 // Changes a certificate made by CreateSelfSigned and signs it again with
-// signer's key: to make authorities and the certificates they issue.
+// the key of by (its own when by is empty): to make authorities and the
+// certificates they issue.
 inline crypto::Credentials Resigned(const crypto::Credentials& made,
-                                    const crypto::Credentials& signer, bool authority) {
+                                    const crypto::Credentials& by, bool authority) {
+    const crypto::Credentials& signer = by.key.Empty() ? made : by;
     X509* x509 = X509_dup(made.certificate.Get());
     for (const int nid : {NID_basic_constraints, NID_authority_key_identifier}) {
         X509_EXTENSION* old = X509_delete_ext(x509, X509_get_ext_by_NID(x509, nid, -1));
