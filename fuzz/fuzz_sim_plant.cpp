@@ -61,8 +61,9 @@ void Exercise(sim::SimulatedPlant& plant, fake::VirtualEventLoop& events,
         Check(args.NumItems > 0 && args.NumItems == args.ItemValues.Count() &&
               args.NumItems == args.Qualities.Count() && args.NumItems == args.TimeStamps.Count());
     });
-    group->SetUpdateRate(100);
-    group->SetIsSubscribed(true);
+    if (group->SetUpdateRate(100) || group->SetIsSubscribed(true)) {
+        return;
+    }
     events.Advance(3000);
     OneBased<Variant> values;
     OneBased<int32_t> qualities;

@@ -8,7 +8,7 @@
 set -euo pipefail
 cd "$(dirname "$0")/.."
 
-packages=(g++ cmake ninja-build pkg-config qt6-base-dev libgl-dev fonts-dejavu-core
+packages=(g++ cmake ninja-build pkg-config qt6-base-dev qt6-svg-dev libgl-dev fonts-dejavu-core
           libgtest-dev libgmock-dev libbenchmark-dev libasio-dev
           nlohmann-json3-dev libssl-dev)
 

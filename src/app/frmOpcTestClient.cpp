@@ -12,6 +12,8 @@
 #include <QVBoxLayout>
 
 #include "platform/Platform.h"
+#include "ui/browse/frmBrowseOpcServers.h"
+#include "ui/browse/frmOpcBrowse.h"
 #include "ui/widgets/HelpTopics.h"
 #include "util/FloatText.h"
 #include "util/ProgramRoutines.h"
@@ -88,11 +90,10 @@ QGroupBox* frmOpcTestClient::CreateAddressFrame() {
     txtItemID = NewTextBox("txtItemID");
     cmdBrowseItems = NewButton("cmdBrowseItems", "Browse", "Browse for OPC Items");
     cmdTest = NewButton("cmdTest", "Test read");
-    // The browsers and the test window come later; until then their
-    // buttons cannot be used.
-    cmdBrowseServers->setEnabled(false);
-    cmdBrowseItems->setEnabled(false);
+    // The test window comes later; until then its button cannot be used.
     cmdTest->setEnabled(false);
+    connect(cmdBrowseServers, &QPushButton::clicked, this, [this] { cmdBrowseServers_Click(); });
+    connect(cmdBrowseItems, &QPushButton::clicked, this, [this] { cmdBrowseItems_Click(); });
 
     auto* grid = new QGridLayout(Frame1);
     grid->addWidget(Label1, 0, 0);
@@ -239,6 +240,33 @@ void frmOpcTestClient::chkUseScaling_Click() {
 
 // Buttons act only once the field the focus came from has passed its check
 // (the check may still be waiting when press and release arrive together).
+void frmOpcTestClient::cmdBrowseServers_Click() {
+    if (!RunPendingValidations()) {
+        return;
+    }
+    std::string sServer = TestChannel().OpcNodeAndServer();
+    if (frmBrowseOpcServers::DoIt(mPlatform, sServer, BrowseMode::OpcServers, this)) {
+        TestChannel().SetOpcNodeAndServer(sServer);
+        txtServerID->setText(QString::fromStdString(sServer));
+    }
+}
+
+void frmOpcTestClient::cmdBrowseItems_Click() {
+    if (!RunPendingValidations()) {
+        return;
+    }
+    std::string sItemID = txtItemID->text().toStdString();
+    std::string sAccessPath = txtAccessPath->text().toStdString();
+    const Channel& channel = TestChannel();
+    if (frmOpcBrowse::DoIt(mPlatform, channel.OpcServerID(), channel.OpcComputer(), sItemID,
+                           sAccessPath, false, false, this)) {
+        txtItemID->setText(QString::fromStdString(sItemID));
+        TestChannel().SetItemName(txtItemID->text().trimmed().toStdString());
+        txtAccessPath->setText(QString::fromStdString(sAccessPath));
+        TestChannel().SetOpcAccessPath(txtAccessPath->text().trimmed().toStdString());
+    }
+}
+
 void frmOpcTestClient::cmdHelp_Click() {
     if (RunPendingValidations()) {
         ShowHelpTopic(mPlatform, 1);

@@ -50,6 +50,8 @@ class frmOpcTestClient : public QWidget {
     void Load();
     void FillFields();
     void chkUseScaling_Click();
+    void cmdBrowseServers_Click();
+    void cmdBrowseItems_Click();
     void cmdHelp_Click();
     void cmdClose_Click();
 

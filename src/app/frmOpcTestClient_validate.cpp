@@ -33,6 +33,16 @@ std::string TrimmedText(const QLineEdit& box) {
 }  // namespace
 
 bool frmOpcTestClient::eventFilter(QObject* watched, QEvent* event) {
+    if (event->type() == QEvent::MouseButtonDblClick &&
+        (watched == txtServerID || watched == txtItemID)) {
+        // The browser opens once the box has finished with the click.
+        QMetaObject::invokeMethod(
+            this,
+            [this, server = watched == txtServerID] {
+                server ? cmdBrowseServers_Click() : cmdBrowseItems_Click();
+            },
+            Qt::QueuedConnection);
+    }
     if (event->type() == QEvent::FocusOut &&
         ChecksField(static_cast<QFocusEvent*>(event)->reason())) {
         QueueValidation(qobject_cast<QWidget*>(watched));

@@ -110,8 +110,9 @@ int main(int argc, char** argv) {
     cv::sim::SimulatedPlant plant(choice.plant, serverCalls,
                                   cv::sim::PlantOptions{computer.Query().value_or(""), {}});
     cv::platform::TraceLog trace;
-    cv::Platform platform{dialogs,  locale,   program, help,  computer,    events,
-                          registry, profiles, run,     plant, serverCalls, trace};
+    cv::Platform platform{dialogs,     locale,   program,        help, computer,
+                          events,      registry, profiles,       run,  plant,
+                          serverCalls, trace,    plant.NetEnum()};
     if (!choice.message.empty()) {
         dialogs.MsgBox(choice.message, cv::MsgBoxStyle::Exclamation, "");
     }

@@ -1,17 +1,24 @@
 #pragma once
 
 #include <cstdint>
+#include <memory>
 #include <string>
+#include <utility>
 
 #include "platform/ErrorInfo.h"
 #include "platform/Variant.h"
 
 namespace cv {
 
+class CvOpcAutoClient;
 class IniFile;
 class TunFile;
 class TunerType;
 struct Platform;
+
+namespace platform {
+class OPCItem;
+}
 
 // The three ranges a channel keeps; their names appear in messages.
 enum class RangeType : int32_t { Engineering = 0, Instrument = 1, Display = 2 };
@@ -37,8 +44,13 @@ inline constexpr int32_t Online = 2;
 class Channel {
   public:
     explicit Channel(Platform& platform);
+    ~Channel();
     Channel(const Channel&) = delete;
     Channel& operator=(const Channel&) = delete;
+
+    // A reference that reads null once this channel is destroyed, for a list
+    // that keeps the channel without owning it (the OPC client's).
+    std::shared_ptr<Channel* const> Presence() const { return mpPresence; }
 
     // Ranges. Equal (or non-finite) limits are stored as 0 and 100.
     double EngMin() const { return mdEngMin; }
@@ -150,6 +162,12 @@ class Channel {
     void OpcSetRawValue(const Variant& vValue, int32_t lQuality, double dTimeStamp,
                         bool bSingleShot);
     void OpcDataChange(const std::string& sText);
+    // The OPC client serving this channel and the channel's OPC item, set by
+    // the client when it adds the channel and released when the channel goes
+    // offline; the client is not owned here.
+    CvOpcAutoClient* OpcClient() const { return mcOpcClient; }
+    void SetOpcClient(CvOpcAutoClient* cClient) { mcOpcClient = cClient; }
+    void SetOpcItem(std::shared_ptr<platform::OPCItem> cItem) { mcOpcItem = std::move(cItem); }
     int32_t OpcServerHandle() const { return mlOpcServerHandle; }
     void SetOpcServerHandle(int32_t lHandle) { mlOpcServerHandle = lHandle; }
     int32_t OpcGroupNumber() const;
@@ -191,6 +209,7 @@ class Channel {
     std::string CommsFailureText() const;
 
     Platform& mPlatform;
+    std::shared_ptr<Channel*> mpPresence = std::make_shared<Channel*>(this);
 
     int32_t miNumber = 0;
     double mdEngMin = 0;
@@ -222,7 +241,9 @@ class Channel {
     std::string msDdeApplication;
     std::string msOpcComputer;
     std::string msOpcServerID;
+    CvOpcAutoClient* mcOpcClient = nullptr;
     int32_t mlOpcServerHandle = 0;
+    std::shared_ptr<platform::OPCItem> mcOpcItem;
     Variant mvRawValue = Variant::Null();
     double mdTimeStamp = 0;
     int32_t mlQuality = 0;

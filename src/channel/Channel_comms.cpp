@@ -1,10 +1,13 @@
 #include <algorithm>
 #include <chrono>
 #include <ctime>
+#include <utility>
 
 #include "channel/Channel.h"
+#include "opc/CvOpcAutoClient.h"
 #include "platform/OleDate.h"
 #include "platform/Platform.h"
+#include "platform/opc/OPCItem.h"
 
 namespace cv {
 
@@ -29,6 +32,10 @@ double OleDateNow() {
 
 }  // namespace
 
+Channel::~Channel() {
+    *mpPresence = nullptr;
+}
+
 int32_t Channel::Online(bool bTimedOut) {
     if (bTimedOut && miState == OnlineState::GoingOnline) {
         GoOffline();
@@ -44,9 +51,17 @@ void Channel::GoOffline() {
     switch (miComType) {
         case ComTypeCode::Dde:
             break;
-        case ComTypeCode::Opc:
+        case ComTypeCode::Opc: {
+            // The channel is offline before the client removes the extra
+            // group, which lets events run while it waits for the server.
             mvRawValue = Variant::Null();
+            mcOpcItem.reset();
+            CvOpcAutoClient* cClient = std::exchange(mcOpcClient, nullptr);
+            if (cClient != nullptr && miSpecificChannelType == kExtraGroupChannel) {
+                cClient->RemoveExtraGroup();
+            }
             break;
+        }
         default:
             mPlatform.dialogs.MsgBox("Error: Channel.GoOffline", MsgBoxStyle::OKOnly, "");
             break;

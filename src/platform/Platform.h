@@ -8,6 +8,7 @@
 #include "platform/EventLoop.h"
 #include "platform/Help.h"
 #include "platform/Locale.h"
+#include "platform/NetEnumApi.h"
 #include "platform/ProfileApi.h"
 #include "platform/ProgramInfo.h"
 #include "platform/RegistryApi.h"
@@ -48,6 +49,8 @@ struct Platform {
     platform::OpcServerFactory& opc;
     platform::ServerCallWait& serverCalls;
     platform::TraceLog& trace;
+    // The computers of the network, for the server browser.
+    platform::NetEnumApi& network;
 };
 
 }  // namespace cv

@@ -5,6 +5,7 @@
 #include <gtest/gtest.h>
 
 #include "channel/Channel.h"
+#include "opc/CvOpcAutoClient.h"
 #include "platform/OleDate.h"
 #include "support/TestPlatform.h"
 
@@ -144,6 +145,22 @@ TEST_F(OpcChannel, TimeStampTimeOutAndSendResults) {
     EXPECT_EQ(std::tuple(channel.SendResult(), channel.ErrorStr()), std::tuple(2, "refused"));
     channel.OpcDataChange("");
     EXPECT_EQ(channel.SendResult(), 0);
+}
+
+// Going offline lets go of the client (a main-group channel calls nothing
+// of it; the extra group's removal is the client's test). A destroyed
+// channel's presence reads null for the lists that keep it.
+TEST_F(OpcChannel, GoingOfflineLetsGoOfTheClient) {
+    CvOpcAutoClient client(tp.platform);
+    channel.SetOpcClient(&client);
+    channel.GoOffline();
+    EXPECT_EQ(channel.OpcClient(), nullptr);
+    EXPECT_EQ(tp.trace.Entries().size(), 0u);
+    auto doomed = std::make_unique<Channel>(tp.platform);
+    const auto presence = doomed->Presence();
+    EXPECT_EQ(*presence, doomed.get());
+    doomed.reset();
+    EXPECT_EQ(*presence, nullptr);
 }
 
 TEST(ChannelComms, OpcMembersByChannelTypeAndTheUnknownTypesFault) {

@@ -22,8 +22,9 @@ namespace cv::test {
 // pinned locale (point decimal unless the test asks for the comma one) and a
 // clock that moves only by hand. The registry and the profile files are the
 // real ones, kept in a fresh temporary folder that goes with the object. OPC
-// servers are the built-in simulated plant on the virtual clock, starting at
-// kStartDate, with this computer named as the computer name says.
+// servers and the network are the built-in simulated plant on the virtual
+// clock, starting at kStartDate, with this computer named as the computer
+// name says.
 struct TestPlatform {
     // 2025-01-01 00:00 local time.
     static constexpr double kStartDate = 45658.0;
@@ -49,8 +50,8 @@ struct TestPlatform {
     sim::SimulatedPlant plant{sim::BuiltInPlant(), serverCalls,
                               sim::PlantOptions{computer.name.value_or(""), kStartDate}};
     platform::TraceLog trace;
-    Platform platform{dialogs,  locale,   program, help,  computer,    events,
-                      registry, profiles, run,     plant, serverCalls, trace};
+    Platform platform{dialogs,  locale, program, help,        computer, events,         registry,
+                      profiles, run,    plant,   serverCalls, trace,    plant.NetEnum()};
 };
 
 }  // namespace cv::test

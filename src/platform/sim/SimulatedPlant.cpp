@@ -5,6 +5,7 @@
 #include "platform/AsciiCase.h"
 #include "platform/opc/OpcResult.h"
 #include "platform/sim/ServerInstance.h"
+#include "platform/sim/SimNetEnum.h"
 #include "platform/sim/SimServer.h"
 
 namespace cv::sim {
@@ -13,7 +14,14 @@ using platform::OpcResult::E_INVALIDARG;
 
 SimulatedPlant::SimulatedPlant(std::shared_ptr<const PlantDescription> plant,
                                platform::ServerCallWait& wait, const PlantOptions& options)
-    : runtime_(std::make_shared<PlantRuntime>(std::move(plant), wait, options)) {}
+    : runtime_(std::make_shared<PlantRuntime>(std::move(plant), wait, options)),
+      netEnum_(std::make_unique<SimNetEnum>(runtime_)) {}
+
+SimulatedPlant::~SimulatedPlant() = default;
+
+platform::NetEnumApi& SimulatedPlant::NetEnum() {
+    return *netEnum_;
+}
 
 ErrorInfo SimulatedPlant::CreateServer(std::unique_ptr<platform::OPCServer>& cServer) {
     if (runtime_->CreateFails()) {

@@ -6,6 +6,7 @@
 #include <vector>
 
 #include "platform/ErrorInfo.h"
+#include "platform/NetEnumApi.h"
 #include "platform/ServerCallWait.h"
 #include "platform/Variant.h"
 #include "platform/opc/OpcServerFactory.h"
@@ -15,11 +16,13 @@
 namespace cv::sim {
 
 class ServerInstance;
+class SimNetEnum;
 
 // The simulated plant: a network of computers with OPC servers, described by
 // a plant file (PlantLoader.h), running on the window thread's event loop.
-// It creates the server objects of the automation interface, and lets tests
-// change the plant while it runs.
+// It creates the server objects of the automation interface, lists its
+// network through the network enumeration, and lets tests change the plant
+// while it runs.
 //
 // Calls into its servers wait through the given ServerCallWait (events run,
 // busy notice, call limit); notifications and shutdowns come from the event
@@ -29,8 +32,13 @@ class SimulatedPlant : public platform::OpcServerFactory {
   public:
     SimulatedPlant(std::shared_ptr<const PlantDescription> plant, platform::ServerCallWait& wait,
                    const PlantOptions& options = {});
+    ~SimulatedPlant() override;
+    SimulatedPlant(const SimulatedPlant&) = delete;
+    SimulatedPlant& operator=(const SimulatedPlant&) = delete;
 
     ErrorInfo CreateServer(std::unique_ptr<platform::OPCServer>& cServer) override;
+    // The plant's network: providers, domains, computers and their shares.
+    platform::NetEnumApi& NetEnum();
 
     const PlantDescription& Description() const { return runtime_->Plant(); }
     // This computer's name on the simulated network.
@@ -70,6 +78,7 @@ class SimulatedPlant : public platform::OpcServerFactory {
                        size_t& item);
 
     std::shared_ptr<PlantRuntime> runtime_;
+    std::unique_ptr<SimNetEnum> netEnum_;
 };
 
 }  // namespace cv::sim

@@ -4,6 +4,7 @@
 #include <asio/connect.hpp>
 #include <asio/post.hpp>
 #include <asio/write.hpp>
+#include <iterator>
 
 #include "ua/services/ChannelServices.h"
 #include "ua/services/ServiceMessages.h"

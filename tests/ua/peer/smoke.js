@@ -217,7 +217,7 @@ function runAnchor(url) {
     const script = path.join(__dirname, "anchor_client.js");
     return new Promise((resolve, reject) => {
         const args = [script, "--url", url, "--count", "20", "--seconds", "0.5", "--warmup", "0"];
-        execFile(process.execPath, args, { timeout: 15000 },
+        execFile(process.execPath, args, { timeout: 120000 },
             (error, stdout) => (error ? reject(error) : resolve(stdout)));
     });
 }
