@@ -2,6 +2,8 @@
 
 #include <filesystem>
 
+#include "platform/fake/RecordingCertificateTrust.h"
+#include "platform/fake/ScriptedPasswordPrompt.h"
 #include "platform/posix/FilePki.h"
 #include "platform/posix/FileRegistry.h"
 #include "security/RunPasswords.h"
@@ -15,31 +17,6 @@ namespace {
 using platform::CertificateProblem;
 using platform::TrustAnswer;
 using ua::test::Await;
-
-class ScriptedTrust : public platform::CertificateTrust {
-  public:
-    TrustAnswer Ask(const platform::TrustQuestion& question) override {
-        questions.push_back(question);
-        return answer;
-    }
-    TrustAnswer answer = TrustAnswer::Refuse;
-    std::vector<platform::TrustQuestion> questions;
-};
-
-class ScriptedPrompt : public platform::PasswordPrompt {
-  public:
-    std::optional<std::string> AskPassword(const platform::PasswordRequest& request) override {
-        requests.push_back(request);
-        if (answers.empty()) {
-            return std::nullopt;
-        }
-        std::string next = answers.front();
-        answers.erase(answers.begin());
-        return next;
-    }
-    std::vector<std::string> answers;
-    std::vector<platform::PasswordRequest> requests;
-};
 
 // The program's way of connecting, against a peer started with --secure
 // --users bob:secret. Each test has its own settings folder, so the peer's
@@ -100,9 +77,9 @@ class SecureConnectTest : public ::testing::Test {
     posix::FilePki pki_{folder_.Path() + "/pki"};
     posix::FileRegistry registry_{folder_.Path()};
     ServerSettings settings_{registry_};
-    ScriptedTrust trust_answers_;
+    fake::RecordingCertificateTrust trust_answers_;
     platform::CertificateTrust* question_ = &trust_answers_;
-    ScriptedPrompt prompt_;
+    fake::ScriptedPasswordPrompt prompt_;
     ua::test::DispatchQueue queue_;
     std::string url_;
     std::unique_ptr<ua::Client> client_;
