@@ -1,10 +1,14 @@
 // The OPC UA client against the node-opcua peer (tests/ua/peer), which this
-// program starts with 10,000 changing variables and stops at the end:
-// - connect time, from Hello to an activated session;
+// program starts with 10,000 changing variables and its secured endpoints,
+// and stops at the end. Each figure of our client comes without security
+// (argument 0) and with Basic256Sha256 SignAndEncrypt (argument 1):
+// - connect time, from Hello to an activated session (secured: the
+//   endpoints and our certificate are at hand, as after the first connect);
 // - 10,000 monitored items at a 100 ms publishing interval: values received
 //   per second and the client's CPU share (process CPU time over wall time;
 //   1.0 is one core), then the same workload received by node-opcua's own
-//   client (the anchor), measured the same way by its script.
+//   client (the anchor, without security), measured the same way by its
+//   script.
 // - the same through the automation interface (the OPC UA backend on a real
 //   event loop): a server object's Connect (connect and session), adding a
 //   group (subscription), adding and activating one item, and its first
@@ -31,7 +35,10 @@
 #include "platform/posix/SteadyEventLoop.h"
 #include "platform/ua/UaBackend.h"
 #include "ua/client/Client.h"
+#include "ua/client/EndpointChoice.h"
+#include "ua/secure/PolicyProfile.h"
 #include "ua/support/DispatchQueue.h"
+#include "ua/support/TestCredentials.h"
 
 extern char** environ;
 
@@ -64,7 +71,8 @@ int Run(std::vector<std::string> args) {
 // The peer, started on first use by this process (it ends with it).
 const std::string& PeerUrl() {
     static const std::string url = [] {
-        if (Run({"bash", kPeerDir + "/start.sh", kState, "--bulk", std::to_string(kItems)}) != 0) {
+        if (Run({"bash", kPeerDir + "/start.sh", kState, "--bulk", std::to_string(kItems),
+                 "--secure"}) != 0) {
             return std::string();
         }
         std::atexit([] { Run({"bash", kPeerDir + "/stop.sh", kState}); });
@@ -74,6 +82,40 @@ const std::string& PeerUrl() {
         return line;
     }();
     return url;
+}
+
+const crypto::Credentials& OwnCredentials() {
+    static const crypto::Credentials credentials = cv::ua::test::MakeCredentials("bench");
+    return credentials;
+}
+
+std::unique_ptr<Client> NewClient(DispatchQueue& queue) {
+    ClientOptions options;
+    options.applicationUri = OwnCredentials().certificate.ApplicationUri();
+    return std::make_unique<Client>(queue.MakeDispatcher(), options);
+}
+
+// No options for argument 0; Basic256Sha256 SignAndEncrypt for 1.
+Result<ConnectOptions> OptionsFor(DispatchQueue& queue, int64_t secured) {
+    if (secured == 0) {
+        return ConnectOptions{};
+    }
+    auto client = NewClient(queue);
+    auto endpoints = Await<std::vector<EndpointDescription>>(
+        queue, [&](auto done) { client->GetEndpoints(PeerUrl(), std::move(done)); });
+    if (!endpoints) {
+        return endpoints.Failure();
+    }
+    auto endpoint = ChooseEndpoint(
+        endpoints.Value(),
+        {MessageSecurityMode::SignAndEncrypt, std::string(SupportedPolicies().front().uri)});
+    if (!endpoint) {
+        return endpoint.Failure();
+    }
+    ConnectOptions connect;
+    connect.endpoint = endpoint.Value();
+    connect.credentials = std::make_shared<crypto::Credentials>(OwnCredentials());
+    return connect;
 }
 
 double CpuSeconds() {
@@ -92,11 +134,17 @@ void BM_ConnectToActivatedSession(benchmark::State& state) {
         return;
     }
     DispatchQueue queue;
+    const auto connect = OptionsFor(queue, state.range(0));
+    if (!connect) {
+        state.SkipWithError(connect.Failure().text.c_str());
+        return;
+    }
     for (auto _ : state) {
-        Client client(queue.MakeDispatcher());
+        auto owned = NewClient(queue);
+        Client& client = *owned;
         const auto start = std::chrono::steady_clock::now();
         auto session = Await<SessionInfo>(
-            queue, [&](auto done) { client.Connect(PeerUrl(), std::move(done)); });
+            queue, [&](auto done) { client.Connect(PeerUrl(), connect.Value(), std::move(done)); });
         state.SetIterationTime(Since(start));
         if (!session) {
             state.SkipWithError(session.Failure().text.c_str());
@@ -107,7 +155,11 @@ void BM_ConnectToActivatedSession(benchmark::State& state) {
         queue.RunUntil([&closed] { return closed; });
     }
 }
-BENCHMARK(BM_ConnectToActivatedSession)->UseManualTime()->Unit(benchmark::kMillisecond);
+BENCHMARK(BM_ConnectToActivatedSession)
+    ->Arg(0)
+    ->Arg(1)
+    ->UseManualTime()
+    ->Unit(benchmark::kMillisecond);
 
 void BM_EndToEnd10000Items100ms(benchmark::State& state) {
     if (PeerUrl().empty()) {
@@ -115,9 +167,16 @@ void BM_EndToEnd10000Items100ms(benchmark::State& state) {
         return;
     }
     DispatchQueue queue;
-    Client client(queue.MakeDispatcher());
+    const auto connect = OptionsFor(queue, state.range(0));
+    if (!connect) {
+        state.SkipWithError(connect.Failure().text.c_str());
+        return;
+    }
+    auto owned = NewClient(queue);
+    Client& client = *owned;
     for (auto _ : state) {
-        if (!Await<SessionInfo>(queue, [&](auto done) { client.Connect(PeerUrl(), done); })) {
+        if (!Await<SessionInfo>(
+                queue, [&](auto done) { client.Connect(PeerUrl(), connect.Value(), done); })) {
             state.SkipWithError("connect failed");
             return;
         }
@@ -173,7 +232,7 @@ void BM_EndToEnd10000Items100ms(benchmark::State& state) {
         queue.RunUntil([&closed] { return closed; });
     }
 }
-BENCHMARK(BM_EndToEnd10000Items100ms)->Iterations(1)->Unit(benchmark::kSecond);
+BENCHMARK(BM_EndToEnd10000Items100ms)->Arg(0)->Arg(1)->Iterations(1)->Unit(benchmark::kSecond);
 
 // node-opcua's client on the same workload; its script prints
 // "ANCHOR key=value ...".

@@ -10,7 +10,7 @@ cd "$(dirname "$0")/.."
 
 packages=(g++ cmake ninja-build pkg-config qt6-base-dev qt6-svg-dev libgl-dev fonts-dejavu-core
           libgtest-dev libgmock-dev libbenchmark-dev libasio-dev
-          nlohmann-json3-dev)
+          nlohmann-json3-dev libssl-dev)
 
 apt_install() {
     local sudo=()

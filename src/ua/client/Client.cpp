@@ -26,10 +26,9 @@ void Client::SetEventHandler(EventHandler handler) {
     });
 }
 
-void Client::Connect(std::string endpointUrl, Callback<SessionInfo> done) {
-    Run([url = std::move(endpointUrl), done = std::move(done)](ClientCore& core) mutable {
-        core.Connect(url, std::move(done));
-    });
+void Client::Connect(std::string endpointUrl, ConnectOptions connect, Callback<SessionInfo> done) {
+    Run([url = std::move(endpointUrl), connect = std::move(connect), done = std::move(done)](
+            ClientCore& core) mutable { core.Connect(url, std::move(connect), std::move(done)); });
 }
 
 void Client::Close(std::function<void()> done) {

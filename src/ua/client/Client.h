@@ -7,6 +7,7 @@
 #include <vector>
 
 #include "ua/client/ClientOptions.h"
+#include "ua/client/ConnectOptions.h"
 #include "ua/client/SessionInfo.h"
 #include "ua/client/SubscriptionTypes.h"
 #include "ua/services/MonitoredItemServices.h"
@@ -48,9 +49,13 @@ class Client {
     // connection is lost for good. Set it before Connect.
     void SetEventHandler(EventHandler handler);
 
-    // Opens a secure channel (SecurityPolicy None) and an anonymous session.
-    // Refused while connected or connecting (Bad_InvalidState).
-    void Connect(std::string endpointUrl, Callback<SessionInfo> done);
+    // Opens a secure channel and a session at endpointUrl as connect says
+    // (by default SecurityPolicy None and an anonymous user). Refused while
+    // connected or connecting (Bad_InvalidState).
+    void Connect(std::string endpointUrl, ConnectOptions connect, Callback<SessionInfo> done);
+    void Connect(std::string endpointUrl, Callback<SessionInfo> done) {
+        Connect(std::move(endpointUrl), {}, std::move(done));
+    }
     // Closes the session (deleting its subscriptions) and the channel.
     void Close(std::function<void()> done);
 

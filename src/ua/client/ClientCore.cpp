@@ -13,7 +13,8 @@ ClientCore::ClientCore(asio::io_context& io, ClientOptions options, Deliver deli
     engine_ = std::make_shared<SubscriptionEngine>(io_, session_, options_, deliver_);
 }
 
-void ClientCore::Connect(const std::string& sEndpointUrl, Callback<SessionInfo> done) {
+void ClientCore::Connect(const std::string& sEndpointUrl, ConnectOptions connect,
+                         Callback<SessionInfo> done) {
     if (session_->IsActive() || connecting_) {
         Reply(done, Result<SessionInfo>(
                         Error{status::BadInvalidState,
@@ -30,12 +31,13 @@ void ClientCore::Connect(const std::string& sEndpointUrl, Callback<SessionInfo> 
             }
         });
     engine_ = std::make_shared<SubscriptionEngine>(io_, session_, options_, deliver_);
-    session_->Connect(sEndpointUrl, [weak = weak_from_this(), done](Result<SessionInfo> info) {
-        if (auto self = weak.lock()) {
-            self->connecting_ = false;
-            self->Reply(done, std::move(info));
-        }
-    });
+    session_->Connect(sEndpointUrl, std::move(connect),
+                      [weak = weak_from_this(), done](Result<SessionInfo> info) {
+                          if (auto self = weak.lock()) {
+                              self->connecting_ = false;
+                              self->Reply(done, std::move(info));
+                          }
+                      });
 }
 
 void ClientCore::OnEvent(ConnectionEvent event, const Error& reason) {

@@ -24,7 +24,8 @@ class ClientCore : public std::enable_shared_from_this<ClientCore> {
     ClientCore(asio::io_context& io, ClientOptions options, Deliver deliver);
 
     void SetEventHandler(Client::EventHandler handler) { events_ = std::move(handler); }
-    void Connect(const std::string& sEndpointUrl, Callback<SessionInfo> done);
+    void Connect(const std::string& sEndpointUrl, ConnectOptions connect,
+                 Callback<SessionInfo> done);
     void Close(std::function<void()> done);
     void Abort();
 

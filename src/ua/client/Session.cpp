@@ -1,9 +1,13 @@
 #include "ua/client/Session.h"
 
 #include <algorithm>
-#include <random>
 
+#include "ua/client/EndpointChoice.h"
+#include "ua/client/IdentityToken.h"
+#include "ua/crypto/Primitives.h"
+#include "ua/secure/MakeSecurityPolicy.h"
 #include "ua/secure/NoneSecurityPolicy.h"
+#include "ua/secure/SessionSignature.h"
 #include "ua/services/ViewServices.h"
 
 namespace cv::ua {
@@ -13,28 +17,9 @@ constexpr size_t kNonceSize = 32;
 constexpr int32_t kServerStateShutdown = 4;
 constexpr uint32_t kMinKeepAliveMs = 100;
 
-ByteString RandomNonce() {
-    std::random_device device;
-    ByteString nonce;
-    nonce.bytes.resize(kNonceSize);
-    for (char& byte : nonce.bytes) {
-        byte = static_cast<char>(device() & 0xFF);
-    }
-    return nonce;
-}
-
-bool IsBinaryNoneEndpoint(const EndpointDescription& endpoint) {
-    return endpoint.securityMode == MessageSecurityMode::None &&
-           endpoint.securityPolicyUri == NoneSecurityPolicy::kUri &&
-           (endpoint.transportProfileUri.empty() ||
-            endpoint.transportProfileUri.ends_with("uatcp-uasc-uabinary"));
-}
-
-const UserTokenPolicy* AnonymousPolicy(const EndpointDescription& endpoint) {
-    const auto found = std::find_if(
-        endpoint.userIdentityTokens.begin(), endpoint.userIdentityTokens.end(),
-        [](const UserTokenPolicy& policy) { return policy.tokenType == UserTokenType::Anonymous; });
-    return found == endpoint.userIdentityTokens.end() ? nullptr : &*found;
+bool IsBinary(const EndpointDescription& endpoint) {
+    return endpoint.transportProfileUri.empty() ||
+           endpoint.transportProfileUri.ends_with("uatcp-uasc-uabinary");
 }
 
 }  // namespace
@@ -52,8 +37,9 @@ bool Session::IsSessionGone(StatusCode status) {
            status == status::BadServerHalted;
 }
 
-void Session::Connect(const std::string& sEndpointUrl,
+void Session::Connect(const std::string& sEndpointUrl, ConnectOptions connect,
                       std::function<void(Result<SessionInfo>)> done) {
+    connect_ = std::move(connect);
     info_ = {};
     info_.endpointUrl = sEndpointUrl;
     OpenChannel(sEndpointUrl,
@@ -70,10 +56,32 @@ void Session::Connect(const std::string& sEndpointUrl,
                 });
 }
 
+// Each channel, the first and every resumed one, gets its own policy made
+// from the same connect options.
+Result<std::unique_ptr<SecurityPolicy>> Session::MakePolicy() const {
+    auto policy =
+        connect_.endpoint
+            ? MakeSecurityPolicy(*connect_.endpoint, connect_.credentials.get())
+            : Result<std::unique_ptr<SecurityPolicy>>(std::make_unique<NoneSecurityPolicy>());
+    if (policy && Secured() &&
+        connect_.credentials->certificate.ApplicationUri() != options_.applicationUri) {
+        policy = Error{status::BadCertificateUriInvalid,
+                       "The program's certificate names the application \"" +
+                           connect_.credentials->certificate.ApplicationUri() +
+                           "\", but the program presents itself as \"" + options_.applicationUri +
+                           "\"."};
+    }
+    return policy;
+}
+
 void Session::OpenChannel(const std::string& sEndpointUrl,
                           std::function<void(Result<Done>)> opened) {
-    channel_ = std::make_shared<SecureChannel>(io_, options_.channel,
-                                               std::make_unique<NoneSecurityPolicy>());
+    auto policy = MakePolicy();
+    if (!policy) {
+        asio::post(io_, [opened = std::move(opened), error = policy.Failure()] { opened(error); });
+        return;
+    }
+    channel_ = std::make_shared<SecureChannel>(io_, options_.channel, std::move(policy.Value()));
     channel_->SetLostHandler([weak = weak_from_this()](const Error& reason) {
         if (auto self = weak.lock()) {
             self->Lose(reason);
@@ -83,6 +91,13 @@ void Session::OpenChannel(const std::string& sEndpointUrl,
 }
 
 void Session::CreateSession(std::function<void(Result<SessionInfo>)> done) {
+    auto nonce = crypto::RandomBytes(kNonceSize);
+    if (!nonce) {
+        channel_->Close();
+        done(nonce.Failure());
+        return;
+    }
+    clientNonce_ = ByteString{std::move(nonce.Value())};
     CreateSessionRequest request;
     request.header.requestHandle = ++lastRequestHandle_;
     request.clientDescription.applicationUri = options_.applicationUri;
@@ -91,7 +106,10 @@ void Session::CreateSession(std::function<void(Result<SessionInfo>)> done) {
     request.clientDescription.applicationType = ApplicationType::Client;
     request.endpointUrl = info_.endpointUrl;
     request.sessionName = options_.sessionName;
-    request.clientNonce = RandomNonce();
+    request.clientNonce = clientNonce_;
+    if (Secured()) {
+        request.clientCertificate = ByteString{connect_.credentials->certificate.Der()};
+    }
     request.requestedSessionTimeout = options_.requestedSessionTimeoutMs;
     request.maxResponseMessageSize = options_.channel.limits.maxMessageSize;
     CallService<CreateSessionRequest, CreateSessionResponse>(
@@ -101,40 +119,108 @@ void Session::CreateSession(std::function<void(Result<SessionInfo>)> done) {
             if (!self) {
                 return;
             }
-            if (!created) {
+            auto checked =
+                created ? self->OnCreated(created.Value()) : Result<Done>(created.Failure());
+            if (!checked) {
                 self->channel_->Close();
-                done(created.Failure());
+                done(checked.Failure());
                 return;
             }
-            const auto& endpoints = created.Value().serverEndpoints;
-            const auto endpoint =
-                std::find_if(endpoints.begin(), endpoints.end(), [](const EndpointDescription& e) {
-                    return IsBinaryNoneEndpoint(e) && AnonymousPolicy(e);
-                });
-            if (endpoint == endpoints.end()) {
-                self->channel_->Close();
-                done(Error{status::BadIdentityTokenInvalid,
-                           "The server offers no endpoint without security that takes an "
-                           "anonymous user."});
-                return;
-            }
-            self->authenticationToken_ = created.Value().authenticationToken;
-            self->info_.sessionId = created.Value().sessionId;
-            self->info_.revisedSessionTimeoutMs = created.Value().revisedSessionTimeout;
-            self->info_.endpoint = *endpoint;
             self->ActivateSession(std::move(done));
         });
 }
 
-void Session::ActivateSession(std::function<void(Result<SessionInfo>)> done) {
+// The server's own description of the endpoint in use: the one discovery
+// offered must be among those CreateSession lists (a server that lists
+// none is taken at its discovery word).
+Result<EndpointDescription> Session::ServerEndpoint(const CreateSessionResponse& created) const {
+    const auto& endpoints = created.serverEndpoints;
+    if (!connect_.endpoint) {
+        auto none = ChooseEndpoint(
+            endpoints, {MessageSecurityMode::None, std::string(NoneSecurityPolicy::kUri),
+                        connect_.identity.type});
+        if (!none) {
+            return Error{status::BadIdentityTokenInvalid, none.Failure().text};
+        }
+        return none;
+    }
+    if (endpoints.empty()) {
+        return *connect_.endpoint;
+    }
+    const auto found = std::find_if(endpoints.begin(), endpoints.end(), [this](const auto& e) {
+        return IsBinary(e) && e.securityMode == connect_.endpoint->securityMode &&
+               e.securityPolicyUri == connect_.endpoint->securityPolicyUri;
+    });
+    if (found == endpoints.end()) {
+        return Error{status::BadSecurityChecksFailed,
+                     "The server's session offers other endpoints than its discovery did (" +
+                         PolicyName(connect_.endpoint->securityPolicyUri) + " " +
+                         ModeName(connect_.endpoint->securityMode) + " is missing)."};
+    }
+    return *found;
+}
+
+Result<Done> Session::OnCreated(const CreateSessionResponse& created) {
+    auto endpoint = ServerEndpoint(created);
+    if (!endpoint) {
+        return endpoint.Failure();
+    }
+    serverCertificate_ = created.serverCertificate.bytes.empty()
+                             ? endpoint.Value().serverCertificate
+                             : created.serverCertificate;
+    if (Secured()) {
+        auto shown = crypto::Certificate::FromDer(connect_.endpoint->serverCertificate.bytes);
+        if (!shown ||
+            !std::string_view(serverCertificate_.bytes).starts_with(shown.Value().LeafDer())) {
+            return Error{status::BadCertificateInvalid,
+                         "The server answered with another certificate than its endpoint shows."};
+        }
+        auto signature =
+            CheckSessionSignature(shown.Value(), connect_.credentials->certificate.Der(),
+                                  clientNonce_.bytes, created.serverSignature);
+        if (!signature) {
+            return signature.Failure();
+        }
+    }
+    authenticationToken_ = created.authenticationToken;
+    serverNonce_ = created.serverNonce;
+    info_.sessionId = created.sessionId;
+    info_.revisedSessionTimeoutMs = created.revisedSessionTimeout;
+    info_.endpoint = std::move(endpoint.Value());
+    return Done{};
+}
+
+Result<ActivateSessionRequest> Session::MakeActivateRequest() const {
     ActivateSessionRequest request;
     request.header.authenticationToken = authenticationToken_;
-    request.header.requestHandle = ++lastRequestHandle_;
     request.localeIds = {"en"};
-    request.userIdentityToken =
-        MakeExtension(AnonymousIdentityToken{AnonymousPolicy(info_.endpoint)->policyId});
+    if (Secured()) {
+        auto signature =
+            SignSession(connect_.credentials->key, serverCertificate_.bytes, serverNonce_.bytes);
+        if (!signature) {
+            return signature.Failure();
+        }
+        request.clientSignature = std::move(signature.Value());
+    }
+    auto token =
+        MakeIdentityToken(connect_.identity, info_.endpoint, serverCertificate_, serverNonce_);
+    if (!token) {
+        return token.Failure();
+    }
+    request.userIdentityToken = std::move(token.Value());
+    return request;
+}
+
+void Session::ActivateSession(std::function<void(Result<SessionInfo>)> done) {
+    auto request = MakeActivateRequest();
+    if (!request) {
+        channel_->Close();
+        done(request.Failure());
+        return;
+    }
+    request.Value().header.requestHandle = ++lastRequestHandle_;
     CallService<ActivateSessionRequest, ActivateSessionResponse>(
-        *channel_, std::move(request), options_.requestTimeoutMs,
+        *channel_, std::move(request.Value()), options_.requestTimeoutMs,
         [weak = weak_from_this(), done = std::move(done)](Result<ActivateSessionResponse> active) {
             auto self = weak.lock();
             if (!self) {
@@ -145,6 +231,7 @@ void Session::ActivateSession(std::function<void(Result<SessionInfo>)> done) {
                 done(active.Failure());
                 return;
             }
+            self->serverNonce_ = active.Value().serverNonce;
             self->active_ = true;
             self->StartKeepAlive();
             done(self->info_);

@@ -11,6 +11,7 @@
 #include <string_view>
 
 #include "ua/client/ClientOptions.h"
+#include "ua/client/ConnectOptions.h"
 #include "ua/client/ServiceCall.h"
 #include "ua/client/SessionInfo.h"
 #include "ua/services/AttributeServices.h"
@@ -19,10 +20,13 @@
 namespace cv::ua {
 
 // A session over its own secure channel: CreateSession with a fresh random
-// nonce, ActivateSession with the endpoint's anonymous policy, typed service
-// calls carrying the session's token, a keep-alive read of the server's
-// state (which also notices an announced shutdown), CloseSession. Lives on
-// the I/O thread.
+// nonce, ActivateSession with the user's identity token, typed service calls
+// carrying the session's token, a keep-alive read of the server's state
+// (which also notices an announced shutdown), CloseSession. On a secured
+// endpoint the channel signs (and encrypts) with the program's certificate,
+// the server's session signature is checked against the certificate the
+// endpoint showed, and ActivateSession carries the program's signature.
+// Lives on the I/O thread.
 //
 // When the channel breaks, the session is resumed on a new one (a new
 // channel, then ActivateSession with the same token) until the session
@@ -36,7 +40,8 @@ class Session : public std::enable_shared_from_this<Session> {
 
     Session(asio::io_context& io, const ClientOptions& options, EventHandler events);
 
-    void Connect(const std::string& sEndpointUrl, std::function<void(Result<SessionInfo>)> done);
+    void Connect(const std::string& sEndpointUrl, ConnectOptions connect,
+                 std::function<void(Result<SessionInfo>)> done);
 
     template <class Request, class Response>
     void Call(Request request, std::function<void(Result<Response>)> done, uint32_t timeoutMs = 0) {
@@ -75,9 +80,16 @@ class Session : public std::enable_shared_from_this<Session> {
         std::unique_ptr<asio::steady_timer> timer;
     };
 
+    Result<std::unique_ptr<SecurityPolicy>> MakePolicy() const;
     void OpenChannel(const std::string& sEndpointUrl, std::function<void(Result<Done>)> opened);
     void CreateSession(std::function<void(Result<SessionInfo>)> done);
+    Result<Done> OnCreated(const CreateSessionResponse& created);
+    Result<EndpointDescription> ServerEndpoint(const CreateSessionResponse& created) const;
     void ActivateSession(std::function<void(Result<SessionInfo>)> done);
+    Result<ActivateSessionRequest> MakeActivateRequest() const;
+    bool Secured() const {
+        return connect_.endpoint && connect_.endpoint->securityMode != MessageSecurityMode::None;
+    }
     void StartKeepAlive();
     void OnKeepAlive(Result<ReadResponse> response);
     void Lose(const Error& reason);
@@ -125,6 +137,10 @@ class Session : public std::enable_shared_from_this<Session> {
     EventHandler events_;
     std::shared_ptr<SecureChannel> channel_;
     asio::steady_timer keepAliveTimer_;
+    ConnectOptions connect_;
+    ByteString clientNonce_;
+    ByteString serverNonce_;
+    ByteString serverCertificate_;
     NodeId authenticationToken_;
     uint32_t lastRequestHandle_ = 0;
     bool active_ = false;

@@ -31,6 +31,10 @@ void ChunkAssembler::AcceptToken(uint32_t tokenId) {
     }
 }
 
+void ChunkAssembler::RetireToken(uint32_t tokenId) {
+    std::erase(tokens_, tokenId);
+}
+
 Result<Done> ChunkAssembler::CheckSequence(uint32_t sequenceNumber) {
     if (lastSequence_) {
         const uint32_t expected = *lastSequence_ + 1;

@@ -45,6 +45,7 @@ class ChunkAssembler {
     // The tokens whose MSG and CLO chunks are accepted: the one in force and
     // the one it replaced.
     void AcceptToken(uint32_t tokenId);
+    void RetireToken(uint32_t tokenId);
 
     Result<Outcome> Add(Frame frame);
 

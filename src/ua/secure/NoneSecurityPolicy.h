@@ -11,8 +11,9 @@ class NoneSecurityPolicy : public SecurityPolicy {
 
     std::string_view Uri() const override { return kUri; }
     MessageSecurityMode Mode() const override { return MessageSecurityMode::None; }
-    ByteString NewClientNonce() override { return {}; }
-    Result<Done> AcceptServerNonce(const ByteString&) override { return Done{}; }
+    Result<ByteString> NewClientNonce() override { return ByteString{}; }
+    Result<Done> AcceptToken(uint32_t, const ByteString&) override { return Done{}; }
+    void RetireToken(uint32_t) override {}
     void WriteAsymmetricHeader(Encoder& encoder) const override;
     Result<Done> ReadAsymmetricHeader(Decoder& decoder) const override;
     size_t BodyRoom(size_t chunkSize, size_t headerSize, bool) const override {

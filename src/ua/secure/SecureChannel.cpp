@@ -31,6 +31,7 @@ SecureChannel::SecureChannel(asio::io_context& io, ChannelOptions options,
       socket_(io),
       connectTimer_(io),
       renewTimer_(io),
+      retireTimer_(io),
       reader_(options.limits.receiveBufferSize),
       writer_(*policy_),
       assembler_(*policy_) {}
@@ -221,7 +222,12 @@ void SecureChannel::SendOpen(bool renew) {
     request.header.timeoutHint = options_.connectTimeoutMs;
     request.requestType = renew ? SecurityTokenRequestType::Renew : SecurityTokenRequestType::Issue;
     request.securityMode = policy_->Mode();
-    request.clientNonce = policy_->NewClientNonce();
+    auto nonce = policy_->NewClientNonce();
+    if (!nonce) {
+        Fail(nonce.Failure());
+        return;
+    }
+    request.clientNonce = std::move(nonce.Value());
     request.requestedLifetime = options_.requestedLifetimeMs;
     Completion done = [self = shared_from_this(), renew](Result<std::string> body) {
         self->OnOpened(std::move(body), renew);
@@ -246,10 +252,13 @@ void SecureChannel::OnOpened(Result<std::string> body, bool renew) {
         return;
     }
     const ChannelSecurityToken& token = response.Value().securityToken;
-    auto keys = policy_->AcceptServerNonce(response.Value().serverNonce);
+    auto keys = policy_->AcceptToken(token.tokenId, response.Value().serverNonce);
     if (!keys) {
         Fail(keys.Failure());
         return;
+    }
+    if (renew && token.tokenId != tokenId_) {
+        RetireAtExpiry(tokenId_);
     }
     channelId_ = token.channelId;
     tokenId_ = token.tokenId;
@@ -258,6 +267,8 @@ void SecureChannel::OnOpened(Result<std::string> body, bool renew) {
     assembler_.AcceptToken(tokenId_);
     const uint32_t lifetime =
         token.revisedLifetime != 0 ? token.revisedLifetime : options_.requestedLifetimeMs;
+    tokenStart_ = std::chrono::steady_clock::now();
+    tokenLifetimeMs_ = lifetime;
     renewTimer_.expires_after(std::chrono::milliseconds(uint64_t{lifetime} * 3 / 4));
     renewTimer_.async_wait([self = shared_from_this()](const asio::error_code& ec) {
         if (!ec && self->state_ == State::Open) {
@@ -271,6 +282,19 @@ void SecureChannel::OnOpened(Result<std::string> body, bool renew) {
         openDone_ = nullptr;
         done(Done{});
     }
+}
+
+// The server may still answer under the token it has just replaced, until
+// that token's lifetime (with the quarter of grace servers give) is over.
+void SecureChannel::RetireAtExpiry(uint32_t tokenId) {
+    retireTimer_.expires_at(tokenStart_ +
+                            std::chrono::milliseconds(uint64_t{tokenLifetimeMs_} * 5 / 4));
+    retireTimer_.async_wait([self = shared_from_this(), tokenId](const asio::error_code& ec) {
+        if (!ec && self->state_ == State::Open) {
+            self->assembler_.RetireToken(tokenId);
+            self->policy_->RetireToken(tokenId);
+        }
+    });
 }
 
 void SecureChannel::Send(std::string body, std::string_view service, uint32_t timeoutMs,
@@ -403,6 +427,7 @@ void SecureChannel::Fail(Error reason) {
     resolver_.cancel();
     connectTimer_.cancel();
     renewTimer_.cancel();
+    retireTimer_.cancel();
     socket_.close(ignored);
     auto pending = std::move(pending_);
     pending_.clear();
@@ -442,6 +467,7 @@ void SecureChannel::Close() {
     resolver_.cancel();
     connectTimer_.cancel();
     renewTimer_.cancel();
+    retireTimer_.cancel();
     for (auto& [id, request] : pending_) {
         request.timer->cancel();
         if (request.service != kOpenService) {
@@ -465,12 +491,14 @@ void SecureChannel::Abort() {
     openDone_ = nullptr;
     lost_ = nullptr;
     pending_.clear();
-    // A write in flight still owns the front buffer: its handler removes it.
-    outbox_.erase(writing_ ? std::next(outbox_.begin()) : outbox_.begin(), outbox_.end());
+    // A write in flight still reads the first bytes; its handler drops them.
+    outbox_.erase(writing_ && !outbox_.empty() ? outbox_.begin() + 1 : outbox_.begin(),
+                  outbox_.end());
     asio::error_code ignored;
     resolver_.cancel();
     connectTimer_.cancel();
     renewTimer_.cancel();
+    retireTimer_.cancel();
     socket_.close(ignored);
 }
 

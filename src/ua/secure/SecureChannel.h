@@ -4,6 +4,7 @@
 #include <asio/io_context.hpp>
 #include <asio/ip/tcp.hpp>
 #include <asio/steady_timer.hpp>
+#include <chrono>
 #include <cstdint>
 #include <deque>
 #include <functional>
@@ -22,8 +23,8 @@ namespace cv::ua {
 // One UA-TCP connection with its secure channel: connect, Hello and
 // Acknowledge, OpenSecureChannel, then requests matched to responses by
 // request id, each with its own time-out; the security token is renewed at
-// 75 % of its lifetime. Lives on the I/O thread: every member is called
-// there and every handler runs there.
+// 75 % of its lifetime, and the one it replaces is accepted until it ends. Lives on the I/O thread:
+// every member is called there and every handler runs there.
 //
 // When the connection fails (an ERR message, a closed socket, a malformed
 // chunk, a server that stopped sending anything), every pending request ends
@@ -75,6 +76,7 @@ class SecureChannel : public std::enable_shared_from_this<SecureChannel> {
     void OnSecureMessage(SecureMessage message);
     void SendOpen(bool renew);
     void OnOpened(Result<std::string> body, bool renew);
+    void RetireAtExpiry(uint32_t tokenId);
     void Track(uint32_t requestId, Completion done, std::string_view service, uint32_t timeoutMs);
     void SendChunks(MessageKind kind, uint32_t requestId, std::string_view body, Completion& done);
     void Write(std::string bytes);
@@ -91,6 +93,7 @@ class SecureChannel : public std::enable_shared_from_this<SecureChannel> {
     asio::ip::tcp::socket socket_;
     asio::steady_timer connectTimer_;
     asio::steady_timer renewTimer_;
+    asio::steady_timer retireTimer_;
     State state_ = State::Idle;
     EndpointUrl url_;
     std::string urlText_;
@@ -106,6 +109,8 @@ class SecureChannel : public std::enable_shared_from_this<SecureChannel> {
     uint32_t channelId_ = 0;
     uint32_t tokenId_ = 0;
     uint32_t tokenCount_ = 0;
+    std::chrono::steady_clock::time_point tokenStart_;
+    uint32_t tokenLifetimeMs_ = 0;
     uint32_t lastRequestId_ = 0;
     uint32_t lastRequestHandle_ = 0;
     uint64_t framesReceived_ = 0;

@@ -1,6 +1,7 @@
 #pragma once
 
 #include <cstddef>
+#include <cstdint>
 #include <string>
 #include <string_view>
 
@@ -17,7 +18,7 @@ class Decoder;
 // header, body) and hands it here to be signed and encrypted before sending,
 // or checked and decrypted after receiving. Open chunks use the asymmetric
 // keys, the others the symmetric keys derived from the nonces of the token
-// in force.
+// named in their security header.
 class SecurityPolicy {
   public:
     virtual ~SecurityPolicy() = default;
@@ -26,8 +27,11 @@ class SecurityPolicy {
     virtual MessageSecurityMode Mode() const = 0;
     // The nonce for an open request; new keys follow from it and the
     // server's nonce once the response has come.
-    virtual ByteString NewClientNonce() = 0;
-    virtual Result<Done> AcceptServerNonce(const ByteString& serverNonce) = 0;
+    virtual Result<ByteString> NewClientNonce() = 0;
+    // The keys of a new token, from the last client nonce and the server's.
+    // The keys of the token before stay until RetireToken.
+    virtual Result<Done> AcceptToken(uint32_t tokenId, const ByteString& serverNonce) = 0;
+    virtual void RetireToken(uint32_t tokenId) = 0;
 
     // The security header of open chunks: policy URI, our certificate and
     // the thumbprint of the server's.

@@ -95,6 +95,23 @@ struct AnonymousIdentityToken {
     }
 };
 
+struct UserNameIdentityToken {
+    static constexpr uint16_t kEncodingId = 324;
+    std::string policyId;
+    std::string userName;
+    // Encrypted as encryptionAlgorithm names; the UTF-8 text when it is empty.
+    ByteString password;
+    std::string encryptionAlgorithm;
+
+    template <class S, class V>
+    static void Visit(S& s, V& v) {
+        v(s.policyId);
+        v(s.userName);
+        v(s.password);
+        v(s.encryptionAlgorithm);
+    }
+};
+
 struct ActivateSessionRequest {
     static constexpr uint16_t kEncodingId = 467;
     RequestHeader header;

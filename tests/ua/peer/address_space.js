@@ -258,8 +258,28 @@ function addBulkFolder(ns, objects, count, startTime) {
 
 // Control.Shutdown: writing true calls onShutdown(reason, delayMs) with the
 // values of Control.ShutdownReason and Control.ShutdownDelay.
-function addControlFolder(ns, objects, onShutdown) {
+// Control.TrustRejected: writing true awaits onTrustRejected() before the
+// Write is answered (the client certificates the peer refused become trusted).
+function addControlFolder(ns, objects, onShutdown, onTrustRejected) {
     const folder = addFolder(ns, objects, "Control");
+    ns.addVariable({
+        organizedBy: folder,
+        nodeId: "s=Control.TrustRejected",
+        browseName: "TrustRejected",
+        dataType: "Boolean",
+        minimumSamplingInterval: 1000,
+        accessLevel: READ_WRITE,
+        userAccessLevel: READ_WRITE,
+        value: {
+            get: () => makeVariant(DataType.Boolean, false),
+            set: async (variant) => {
+                if (variant.value === true) {
+                    await onTrustRejected();
+                }
+                return StatusCodes.Good;
+            }
+        }
+    });
     const reason = addMemoryVariable(ns, folder, "Control.ShutdownReason", DataType.String,
         "The test peer was asked to shut down", READ_WRITE);
     const delay = addMemoryVariable(ns, folder, "Control.ShutdownDelay", DataType.Int32, 1000,
@@ -287,7 +307,7 @@ function buildAddressSpace(server, options) {
     addSlowFolder(ns, objects, options.slowMs);
     addLargeFolder(ns, objects);
     addBulkFolder(ns, objects, options.bulk, startTime);
-    addControlFolder(ns, objects, options.onShutdown);
+    addControlFolder(ns, objects, options.onShutdown, options.onTrustRejected);
     return { stop: stopDynamic };
 }
 

@@ -5,12 +5,21 @@
 // "READY <endpointUrl>" once it listens, "SHUTDOWN <reason>" when it starts to
 // shut down and "STOPPED" just before it exits.
 
+const fs = require("node:fs");
+const path = require("node:path");
 const { parseArgs } = require("node:util");
-const { OPCUAServer, MessageSecurityMode, SecurityPolicy, Subscription } = require("node-opcua");
+const {
+    OPCUACertificateManager,
+    OPCUAServer,
+    MessageSecurityMode,
+    SecurityPolicy,
+    Subscription
+} = require("node-opcua");
 const { buildAddressSpace } = require("./address_space");
 
 const USAGE = `usage: node server.js [--port N|free] [--resource-path PATH] [--token-lifetime MS]
-                      [--bulk N] [--slow-ms MS] [--exit-with-pid PID]`;
+                      [--bulk N] [--slow-ms MS] [--secure] [--users NAME:PASSWORD,...]
+                      [--reject-unknown] [--exit-with-pid PID]`;
 const STOP_DELAY_MS = 100;
 const SHUTDOWN_GRACE_MS = 10000;
 const PARENT_POLL_MS = 1000;
@@ -29,6 +38,19 @@ function toInteger(name, text, min, max) {
     return value;
 }
 
+// "name:password,name2:password2" as a map from name to password.
+function parseUsers(text) {
+    const users = new Map();
+    for (const pair of (text || "").split(",").filter((p) => p !== "")) {
+        const colon = pair.indexOf(":");
+        if (colon <= 0) {
+            fail(`--users needs NAME:PASSWORD pairs separated by commas, not "${pair}"`);
+        }
+        users.set(pair.slice(0, colon), pair.slice(colon + 1));
+    }
+    return users;
+}
+
 function parseOptions(argv) {
     let parsed;
     try {
@@ -40,6 +62,9 @@ function parseOptions(argv) {
                 "token-lifetime": { type: "string" },
                 "bulk": { type: "string", default: "0" },
                 "slow-ms": { type: "string", default: "3000" },
+                "secure": { type: "boolean", default: false },
+                "users": { type: "string" },
+                "reject-unknown": { type: "boolean", default: false },
                 "exit-with-pid": { type: "string" }
             }
         }).values;
@@ -54,21 +79,68 @@ function parseOptions(argv) {
             : toInteger("token-lifetime", parsed["token-lifetime"], 1000, 3600000),
         bulk: toInteger("bulk", parsed.bulk, 0, 1000000),
         slowMs: toInteger("slow-ms", parsed["slow-ms"], 0, 600000),
+        secure: parsed.secure,
+        users: parseUsers(parsed.users),
+        rejectUnknown: parsed["reject-unknown"],
         exitWithPid: parsed["exit-with-pid"] === undefined ? undefined
             : toInteger("exit-with-pid", parsed["exit-with-pid"], 1, 4194304)
     };
 }
 
-// Security stays at None for now; a secure variant adds its policies here.
-function makeServer(options) {
+// With --secure the peer offers None and both signing policies in both modes.
+function securityOptions(options) {
+    if (!options.secure) {
+        return {
+            securityPolicies: [SecurityPolicy.None],
+            securityModes: [MessageSecurityMode.None]
+        };
+    }
+    return {
+        securityPolicies: [SecurityPolicy.None, SecurityPolicy.Basic256Sha256,
+            SecurityPolicy.Aes128_Sha256_RsaOaep],
+        securityModes: [MessageSecurityMode.None, MessageSecurityMode.Sign,
+            MessageSecurityMode.SignAndEncrypt]
+    };
+}
+
+// With --reject-unknown the peer keeps its own PKI (under XDG_CONFIG_HOME) and
+// refuses client certificates it does not trust; Control.TrustRejected trusts
+// those it has refused so far.
+function makeCertificateManager(options) {
+    if (!options.rejectUnknown) {
+        return undefined;
+    }
+    return new OPCUACertificateManager({
+        automaticallyAcceptUnknownCertificate: false,
+        rootFolder: path.join(process.env.XDG_CONFIG_HOME || ".", "peer-pki")
+    });
+}
+
+async function trustRejected(manager) {
+    if (!manager) {
+        return;
+    }
+    const folder = manager.rejectedFolder;
+    for (const name of await fs.promises.readdir(folder)) {
+        const text = await fs.promises.readFile(path.join(folder, name), "utf8");
+        const base64 = text.replace(/-----[^-]+-----/g, "").replace(/\s+/g, "");
+        await manager.trustCertificate(Buffer.from(base64, "base64"));
+    }
+}
+
+function makeServer(options, certificateManager) {
+    const users = options.users;
     return new OPCUAServer({
         port: options.port,
         host: "127.0.0.1",
         hostname: "127.0.0.1",
         resourcePath: options.resourcePath,
         defaultSecureTokenLifetime: options.tokenLifetime,
-        securityPolicies: [SecurityPolicy.None],
-        securityModes: [MessageSecurityMode.None],
+        ...securityOptions(options),
+        serverCertificateManager: certificateManager,
+        userManager: {
+            isValidUser: (name, password) => users.has(name) && users.get(name) === password
+        },
         allowAnonymous: true,
         isAuditing: false,
         maxConnectionsPerEndpoint: 50,
@@ -134,13 +206,15 @@ async function main() {
     // the client asked; let the client's maxNotificationsPerPublish decide instead
     // (the benchmark's 10,000 items then arrive in one response per interval).
     Subscription.maxNotificationPerPublishHighLimit = MAX_NOTIFICATIONS_PER_PUBLISH;
-    const server = makeServer(options);
+    const certificateManager = makeCertificateManager(options);
+    const server = makeServer(options, certificateManager);
     let space;
     const shutdown = makeShutdown(server, () => space && space.stop());
     await server.initialize();
     space = buildAddressSpace(server, {
         bulk: options.bulk,
         slowMs: options.slowMs,
+        onTrustRejected: () => trustRejected(certificateManager),
         onShutdown: (reason, delayMs) => setImmediate(() => shutdown(reason, Math.max(0, delayMs)))
     });
     for (const signal of ["SIGTERM", "SIGINT"]) {
