@@ -44,6 +44,12 @@ void WaitProgress::ReInitialize() {
     }
 }
 
+void WaitProgress::OverrideWaitTime(int32_t lWaitMs) {
+    if (mcTimer) {
+        mcTimer->InitializeNow(lWaitMs);
+    }
+}
+
 bool WaitProgress::ShowIt(const std::string& sDescription, const std::string& sLeftButton,
                           const std::string& sRightButton) {
     msText = sDescription;

@@ -34,6 +34,8 @@ class WaitProgress {
                     const std::string& sRegItem);
     // Restarts the count, keeping the time-out.
     void ReInitialize();
+    // Waits lWaitMs from now instead, without remembering it.
+    void OverrideWaitTime(int32_t lWaitMs);
     bool ShowIt(const std::string& sDescription, const std::string& sLeftButton,
                 const std::string& sRightButton);
     void UpdateCompletion(int32_t lPercent, const std::string& sDescript);
