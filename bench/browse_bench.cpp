@@ -74,9 +74,10 @@ struct BenchPlatform {
     test::TestPlatform tp;
     sim::SimulatedPlant plant{BenchPlant(), tp.serverCalls,
                               sim::PlantOptions{"HERE", test::TestPlatform::kStartDate}};
-    Platform platform{tp.dialogs,     tp.locale,   tp.program,     tp.help, tp.computer,
-                      tp.events,      tp.registry, tp.profiles,    tp.run,  plant,
-                      tp.serverCalls, tp.trace,    plant.NetEnum()};
+    Platform platform{
+        tp.dialogs,      tp.locale,          tp.program, tp.help, tp.computer,    tp.events,
+        tp.registry,     tp.profiles,        tp.run,     plant,   tp.serverCalls, tp.trace,
+        plant.NetEnum(), plant.DdeServers(), tp.modeless};
 };
 
 void ItemBranchInTheWindow(benchmark::State& state) {

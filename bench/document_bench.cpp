@@ -62,9 +62,21 @@ void BM_ReadDocumentCold(benchmark::State& state) {
     cv::test::TestPlatform& tp = saved.tp;
     for (auto _ : state) {
         cv::posix::FileProfiles profiles(tp.folder.Path());
-        cv::Platform platform{tp.dialogs,     tp.locale,   tp.program,        tp.help, tp.computer,
-                              tp.events,      tp.registry, profiles,          tp.run,  tp.plant,
-                              tp.serverCalls, tp.trace,    tp.plant.NetEnum()};
+        cv::Platform platform{tp.dialogs,
+                              tp.locale,
+                              tp.program,
+                              tp.help,
+                              tp.computer,
+                              tp.events,
+                              tp.registry,
+                              profiles,
+                              tp.run,
+                              tp.plant,
+                              tp.serverCalls,
+                              tp.trace,
+                              tp.plant.NetEnum(),
+                              tp.plant.DdeServers(),
+                              tp.modeless};
         cv::TunFile document(platform);
         benchmark::DoNotOptimize(document.ReadFromDisk(kOpcTuner, saved.path));
     }

@@ -29,7 +29,9 @@
 #include "platform/qt/QtDialogs.h"
 #include "platform/qt/QtEventLoop.h"
 #include "platform/qt/QtLocale.h"
+#include "platform/qt/QtModelessMessages.h"
 #include "platform/sim/PlantLoader.h"
+#include "platform/sim/SimDdeServers.h"
 #include "platform/sim/SimulatedPlant.h"
 #include "util/ProgramRoutines.h"
 
@@ -110,9 +112,11 @@ int main(int argc, char** argv) {
     cv::sim::SimulatedPlant plant(choice.plant, serverCalls,
                                   cv::sim::PlantOptions{computer.Query().value_or(""), {}});
     cv::platform::TraceLog trace;
-    cv::Platform platform{dialogs,     locale,   program,        help, computer,
-                          events,      registry, profiles,       run,  plant,
-                          serverCalls, trace,    plant.NetEnum()};
+    cv::qtui::QtModelessMessages modeless(cv::ProgramTitle());
+    cv::Platform platform{
+        dialogs,  locale, program, help,        computer, events,          registry,
+        profiles, run,    plant,   serverCalls, trace,    plant.NetEnum(), plant.DdeServers(),
+        modeless};
     if (!choice.message.empty()) {
         dialogs.MsgBox(choice.message, cv::MsgBoxStyle::Exclamation, "");
     }

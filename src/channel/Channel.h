@@ -17,8 +17,9 @@ class TunerType;
 struct Platform;
 
 namespace platform {
+class DdeLink;
 class OPCItem;
-}
+}  // namespace platform
 
 // The three ranges a channel keeps; their names appear in messages.
 enum class RangeType : int32_t { Engineering = 0, Instrument = 1, Display = 2 };
@@ -149,7 +150,25 @@ class Channel {
     // (state GoingOnline); only then does a good value bring it online.
     void MarkGoingOnline() { miState = OnlineState::GoingOnline; }
     int32_t Online(bool bTimedOut);
+    // False only for an extra charted channel of a simulation document.
+    bool OKtoGoOnline(const TunFile& cTunFile) const;
+    // The communications life cycle. lButtons and sText are the owner's
+    // message style and consequence text for a failure, shown (or, when
+    // bSilent, left in ErrorStr) together with the diagnosis; the failing
+    // channel is offline.
+    bool CreateCommsObjects(TunFile& cTunFile, int32_t& lButtons, std::string& sText, bool bSilent);
+    bool GoOnline(TunFile& cTunFile, int32_t& lButtons, std::string& sText, bool bSilent);
     void GoOffline();
+    bool SingleShotRead(TunFile& cTunFile, bool bSilent);
+    // Goes offline and, for DDE, lets go of the DDE label.
+    void ClearCommunicationsObject();
+    // Writes sValue unchanged (DDE poke or OPC write); SendResult tells how
+    // it went and ErrorStr why it failed.
+    bool SendValue(const std::string& sValue);
+    // The DDE link of a DDE channel. Attaching one points it at DdeAppTopic
+    // and ItemName; a step that fails ends it silently.
+    const std::shared_ptr<platform::DdeLink>& DdeLabel() const { return mcDdeLabel; }
+    void SetDdeLabel(std::shared_ptr<platform::DdeLink> cLabel);
     // Returns the stored error text and clears it.
     std::string ErrorStr();
     int32_t SendResult() const { return miSendResult; }
@@ -182,6 +201,12 @@ class Channel {
                                std::string& sQuestion, const ErrorInfo& currentError);
 
   private:
+    bool GoOnlineDde(TunFile& cTunFile, ErrorInfo& error);
+    ErrorInfo SendDde(const std::string& sValue);
+    bool SendOpc(const std::string& sValue);
+    int32_t ReportCommsError(const ErrorInfo& error, int32_t lButtons, std::string& sText,
+                             bool bSilent);
+    void OfferLongerDdeTimeout(int32_t lAnswer, const ErrorInfo& error, TunFile& cTunFile);
     std::string RoleName() const;
     std::string ChannelSection() const;
     bool IsSpOfFaceplate(cv::TunerType& cTuner) const;
@@ -244,6 +269,7 @@ class Channel {
     CvOpcAutoClient* mcOpcClient = nullptr;
     int32_t mlOpcServerHandle = 0;
     std::shared_ptr<platform::OPCItem> mcOpcItem;
+    std::shared_ptr<platform::DdeLink> mcDdeLabel;
     Variant mvRawValue = Variant::Null();
     double mdTimeStamp = 0;
     int32_t mlQuality = 0;

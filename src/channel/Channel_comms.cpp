@@ -5,6 +5,7 @@
 
 #include "channel/Channel.h"
 #include "opc/CvOpcAutoClient.h"
+#include "platform/DdeLink.h"
 #include "platform/OleDate.h"
 #include "platform/Platform.h"
 #include "platform/opc/OPCItem.h"
@@ -50,6 +51,9 @@ void Channel::GoOffline() {
     miState = OnlineState::Offline;
     switch (miComType) {
         case ComTypeCode::Dde:
+            if (mcDdeLabel) {
+                (void)mcDdeLabel->SetLinkMode(platform::DdeLinkMode::None);
+            }
             break;
         case ComTypeCode::Opc: {
             // The channel is offline before the client removes the extra

@@ -1,5 +1,5 @@
 #include "channel/Channel.h"
-
+#include "platform/DdeLink.h"
 #include "platform/Platform.h"
 #include "util/ProgramRoutines.h"
 
@@ -84,6 +84,9 @@ void Channel::ProveNumber() {
 Variant Channel::RawValue() {
     if (miState != OnlineState::Online) {
         return Variant::I2(0);
+    }
+    if (miComType == ComTypeCode::Dde) {
+        return mcDdeLabel ? Variant::Str(mcDdeLabel->Text()) : Variant::I2(0);
     }
     if (miComType != ComTypeCode::Opc && miComType != ComTypeCode::OpcHda) {
         return Variant::I2(0);

@@ -6,6 +6,7 @@
 #include <vector>
 
 #include "channel/Channel.h"
+#include "platform/ModelessMessages.h"
 
 namespace cv {
 
@@ -26,6 +27,8 @@ class ArchiveChannels {
     static constexpr int32_t kMaxChannels = 1000;
 
     explicit ArchiveChannels(Platform& platform);
+    // Goes offline first.
+    ~ArchiveChannels();
     ArchiveChannels(const ArchiveChannels&) = delete;
     ArchiveChannels& operator=(const ArchiveChannels&) = delete;
 
@@ -69,9 +72,30 @@ class ArchiveChannels {
     // lMaster 1: SP takes PV's display range and units; 3: the reverse.
     void SetPVSPDisplayLimitsEqual(int32_t lMaster);
 
+    // Online together. A PV or CO that fails is fatal: the collection goes
+    // offline and the failure is shown modally. SP and extra channels that
+    // fail are reported and the rest goes on; once every channel was seen
+    // online, each such channel's failure shows in one modeless window of
+    // its own. 0 offline, 1 waiting, 2 online.
+    int32_t Online(bool bTimedOut);
+    bool IsOnline() { return Online(false) == OnlineState::Online; }
+    bool CreateCommsObjects(TunFile& cTunFile, bool bSilent);
+    bool GoOnline(TunFile& cTunFile, bool bSilent);
+    // Every channel offline and every message window closed.
+    void GoOffline();
+    bool SingleShotRead(TunFile& cTunFile);
+
   private:
+    using Step = bool (Channel::*)(TunFile&, int32_t&, std::string&, bool);
+    bool EveryChannel(Step step, TunFile& cTunFile, bool bSilent);
+    bool ReportDropOut(Channel& cChannel);
+    void CloseMessageWindows();
+
     Platform& mPlatform;
     std::vector<std::unique_ptr<Channel>> maChannels;
+    // One modeless window per channel number; a single slot until every
+    // channel was first seen online.
+    std::vector<platform::ModelessMessages::WindowId> maMessageWindows{0};
 };
 
 }  // namespace cv

@@ -2,6 +2,7 @@
 
 #include <cstdint>
 #include <memory>
+#include <string>
 #include <vector>
 
 #include "channel/Channel.h"
@@ -58,7 +59,22 @@ class SpecificChannels {
     // The first channel of that type, or nullptr.
     Channel* Item(int32_t lType) const;
 
+    // Online together, with the read channel of each setting deciding for
+    // the next: no P, no I and D. Channel failures are reported by the
+    // channels with what they disable; the collection itself never fails to
+    // go online. 0 offline, 1 waiting, 2 online.
+    int32_t Online(bool bTimedOut);
+    bool IsOnline() { return Online(false) == OnlineState::Online; }
+    bool CreateCommsObjects(TunFile& cTunFile, bool bSilent);
+    bool GoOnline(TunFile& cTunFile, bool bSilent);
+    void GoOffline();
+    bool SingleShotRead(TunFile& cTunFile);
+
   private:
+    bool CreateOne(Channel* cChannel, TunFile& cTunFile, const std::string& sMessage, bool bSilent);
+    bool GoOnlineOne(Channel* cChannel, TunFile& cTunFile, const std::string& sMessage,
+                     bool bSilent);
+    void ReportDropOut(Channel& cChannel);
     Channel* Add(int32_t lType);
     void Clear();
 

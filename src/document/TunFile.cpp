@@ -1,5 +1,7 @@
 #include "document/TunFile.h"
 
+#include "opc/CvOpcAutoClient.h"
+
 #include "document/CorvalentIni.h"
 
 namespace cv {
@@ -13,7 +15,9 @@ TunFile::TunFile(Platform& platform)
       mcTunerType(platform),
       mcGeneral(std::make_unique<TunFileGeneral>(platform)) {}
 
-TunFile::~TunFile() = default;
+TunFile::~TunFile() {
+    GoOffline();
+}
 
 void TunFile::SetDefaults(int32_t lTuner) {
     mcTunerType.SetTuner(lTuner);

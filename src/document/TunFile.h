@@ -3,6 +3,7 @@
 #include <cstdint>
 #include <memory>
 #include <string>
+#include <vector>
 
 #include "channel/Channel.h"
 #include "document/ArchiveChannels.h"
@@ -26,6 +27,8 @@ struct Platform;
 // A default document's file is "LoopTag.tun" in the program's folder, or,
 // when that folder cannot be written, in the program's data folder
 // (ProgramInfo::DataFolder) under the same name.
+class CvOpcAutoClient;
+
 class TunFile {
   public:
     static constexpr const char* kDefaultFileName = "LoopTag.tun";
@@ -106,6 +109,32 @@ class TunFile {
     bool IsValid() const { return mcArchives->Count() >= 1; }
     bool IsSimulation() const { return false; }
 
+    // Online as a whole: 0 offline, 1 waiting for a first value, 2 online.
+    // With bTimedOut a channel still waiting fails as timed out.
+    int32_t Online(bool bTimedOut);
+    // Creates every channel's communications and starts the scan; a failure
+    // leaves everything offline. bSilent leaves the channels' failures in
+    // their error texts.
+    bool GoOnline(bool bSilent);
+    void GoOffline();
+    // One read of every online channel; false (everything offline) on a
+    // failure, or with hot links on, or with the charted channels offline.
+    bool SingleShotRead();
+
+    // The OPC clients, one per server ID and computer, in creation order;
+    // they exist only while online.
+    const std::vector<std::unique_ptr<CvOpcAutoClient>>& OpcClients() const { return mcOpcClients; }
+    // Serves the channel by the client of its server and computer, which is
+    // created and connected first when there is none.
+    ErrorInfo CreateOpcAutoObject(Channel& cChannel);
+    // Every client's main group: update rate lRate (ms) and notifications on.
+    void OpcAutoGoOnline(int32_t lRate);
+    // Ends every client and empties the list.
+    void OpcAutoGoOffline();
+    // One device read of group lGroup through every client, up to the first
+    // that fails.
+    ErrorInfo OpcAutoSingleShotRead(int32_t lGroup);
+
   private:
     int32_t ArchiveNumber(int32_t lNumber) const;
     Channel* ArchiveObj(int32_t lNumber) const;
@@ -121,6 +150,7 @@ class TunFile {
     cv::TunerType mcTunerType;
     std::unique_ptr<TunFileGeneral> mcGeneral;
     ModeMapClass mcModeMap;
+    std::vector<std::unique_ptr<CvOpcAutoClient>> mcOpcClients;
 };
 
 }  // namespace cv

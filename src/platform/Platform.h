@@ -4,10 +4,12 @@
 #include <string>
 
 #include "platform/ComputerName.h"
+#include "platform/DdeLink.h"
 #include "platform/Dialogs.h"
 #include "platform/EventLoop.h"
 #include "platform/Help.h"
 #include "platform/Locale.h"
+#include "platform/ModelessMessages.h"
 #include "platform/NetEnumApi.h"
 #include "platform/ProfileApi.h"
 #include "platform/ProgramInfo.h"
@@ -51,6 +53,10 @@ struct Platform {
     platform::TraceLog& trace;
     // The computers of the network, for the server browser.
     platform::NetEnumApi& network;
+    // DDE links for DDE channels and the item test window.
+    platform::DdeLinkFactory& dde;
+    // Message windows that stay open, one per failing charted channel.
+    platform::ModelessMessages& modeless;
 };
 
 }  // namespace cv

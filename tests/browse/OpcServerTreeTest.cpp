@@ -239,9 +239,21 @@ TEST_F(OpcServerTreeTest, SharesAndOtherResourcesAreNotShown) {
         test::ScriptedNetEnum::Record(kDisplayTypeNetwork, "Net"),
         test::ScriptedNetEnum::Record(kDisplayTypeServer, "B"),
     };
-    Platform platform{tp.dialogs,     tp.locale,   tp.program,  tp.help, tp.computer,
-                      tp.events,      tp.registry, tp.profiles, tp.run,  tp.plant,
-                      tp.serverCalls, tp.trace,    net};
+    Platform platform{tp.dialogs,
+                      tp.locale,
+                      tp.program,
+                      tp.help,
+                      tp.computer,
+                      tp.events,
+                      tp.registry,
+                      tp.profiles,
+                      tp.run,
+                      tp.plant,
+                      tp.serverCalls,
+                      tp.trace,
+                      net,
+                      tp.plant.DdeServers(),
+                      tp.modeless};
     Open(BrowseMode::OpcServers, "", &platform);
     Expand("N1");
     EXPECT_EQ(Under("N1"), "S3 A\nD5 Dom\nE6 Entire Network\nS7 B\n");

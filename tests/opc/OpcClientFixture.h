@@ -27,9 +27,21 @@ inline constexpr int32_t kGood = 0xC0;
 struct OpcClientTest : ::testing::Test {
     TestPlatform tp;
     fake::ScriptedOpc script;
-    Platform scripted{tp.dialogs,     tp.locale,   tp.program,        tp.help, tp.computer,
-                      tp.events,      tp.registry, tp.profiles,       tp.run,  script,
-                      tp.serverCalls, tp.trace,    tp.plant.NetEnum()};
+    Platform scripted{tp.dialogs,
+                      tp.locale,
+                      tp.program,
+                      tp.help,
+                      tp.computer,
+                      tp.events,
+                      tp.registry,
+                      tp.profiles,
+                      tp.run,
+                      script,
+                      tp.serverCalls,
+                      tp.trace,
+                      tp.plant.NetEnum(),
+                      tp.plant.DdeServers(),
+                      tp.modeless};
     std::vector<std::unique_ptr<Channel>> channels;
 
     // An OPC channel waiting for its first value; specific type 13 belongs

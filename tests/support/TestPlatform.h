@@ -13,7 +13,9 @@
 #include "platform/posix/FileProfiles.h"
 #include "platform/posix/FileRegistry.h"
 #include "platform/sim/PlantLoader.h"
+#include "platform/sim/SimDdeServers.h"
 #include "platform/sim/SimulatedPlant.h"
+#include "support/RecordingModeless.h"
 #include "support/TempFolder.h"
 
 namespace cv::test {
@@ -22,7 +24,7 @@ namespace cv::test {
 // pinned locale (point decimal unless the test asks for the comma one) and a
 // clock that moves only by hand. The registry and the profile files are the
 // real ones, kept in a fresh temporary folder that goes with the object. OPC
-// servers and the network are the built-in simulated plant on the virtual
+// servers, DDE applications and the network are the built-in simulated plant on the virtual
 // clock, starting at kStartDate, with this computer named as the computer
 // name says.
 struct TestPlatform {
@@ -50,8 +52,11 @@ struct TestPlatform {
     sim::SimulatedPlant plant{sim::BuiltInPlant(), serverCalls,
                               sim::PlantOptions{computer.name.value_or(""), kStartDate}};
     platform::TraceLog trace;
-    Platform platform{dialogs,  locale, program, help,        computer, events,         registry,
-                      profiles, run,    plant,   serverCalls, trace,    plant.NetEnum()};
+    RecordingModeless modeless;
+    Platform platform{
+        dialogs,  locale, program, help,        computer, events,          registry,
+        profiles, run,    plant,   serverCalls, trace,    plant.NetEnum(), plant.DdeServers(),
+        modeless};
 };
 
 }  // namespace cv::test

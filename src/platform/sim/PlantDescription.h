@@ -5,6 +5,7 @@
 #include <string>
 #include <string_view>
 #include <unordered_map>
+#include <utility>
 #include <vector>
 
 #include "platform/Variant.h"
@@ -99,11 +100,29 @@ struct ServerSpec {
     std::unordered_map<std::string, size_t> byId_;
 };
 
+// How a DDE application answers a conversation.
+enum class DdeAnswer {
+    Always,  // answers at once
+    Never,   // does not answer the initiate (not running)
+    Late,    // answers the initiate, then lets every request time out
+};
+struct DdeTopicSpec {
+    std::string name;
+    // Item name and initial text; other items are refused.
+    std::vector<std::pair<std::string, std::string>> items;
+};
+struct DdeAppSpec {
+    std::string name;
+    DdeAnswer answer = DdeAnswer::Always;
+    std::vector<DdeTopicSpec> topics;
+};
+
 struct PlantDescription {
     std::string source;  // the file it came from, for messages
     std::vector<ProviderSpec> providers;
     std::vector<ComputerSpec> computers;
     std::vector<ServerSpec> servers;
+    std::vector<DdeAppSpec> ddeApps;
 
     // Look-ups ignore letter case; nullptr when there is no such entry.
     const ComputerSpec* FindComputer(std::string_view name) const;

@@ -64,7 +64,7 @@ std::string PlantReader::Message(const Fault& fault) const {
 bool PlantReader::Read(PlantDescription& plant) {
     try {
         const Node root{&document_.Root(), "", ""};
-        ExpectObject(root, {"network", "computers", "templates", "servers"});
+        ExpectObject(root, {"network", "computers", "templates", "servers", "ddeApplications"});
         templates_ = root.Key("templates");
         if (templates_.value != nullptr && !templates_->is_object()) {
             Fail(templates_, "needs an object of item lists, one per template name");
@@ -75,6 +75,9 @@ bool PlantReader::Read(PlantDescription& plant) {
         }
         ReadServers(root.Key("servers"), plant);
         ReadComputers(root.Key("computers"), plant);
+        if (Has(root, "ddeApplications")) {
+            ReadDdeApps(root.Key("ddeApplications"), plant);
+        }
         return true;
     } catch (const Fault& fault) {
         error_ = Message(fault);

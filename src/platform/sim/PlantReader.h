@@ -62,6 +62,10 @@ class PlantReader {
     static std::vector<std::string> Names(const Node& node, const char* key);
 
     void ReadNetwork(const Node& node, PlantDescription& plant);
+    // DDE applications (PlantReader_dde.cpp).
+    void ReadDdeApps(const Node& node, PlantDescription& plant);
+    static DdeAppSpec ReadDdeApp(const Node& node);
+    static DdeTopicSpec ReadDdeTopic(const Node& node);
     void ReadComputers(const Node& node, PlantDescription& plant);
     ComputerSpec ReadComputer(const Node& node, const PlantDescription& plant);
     void ReadServers(const Node& node, PlantDescription& plant);

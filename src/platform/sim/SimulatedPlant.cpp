@@ -5,6 +5,7 @@
 #include "platform/AsciiCase.h"
 #include "platform/opc/OpcResult.h"
 #include "platform/sim/ServerInstance.h"
+#include "platform/sim/SimDdeServers.h"
 #include "platform/sim/SimNetEnum.h"
 #include "platform/sim/SimServer.h"
 
@@ -14,10 +15,15 @@ using platform::OpcResult::E_INVALIDARG;
 
 SimulatedPlant::SimulatedPlant(std::shared_ptr<const PlantDescription> plant,
                                platform::ServerCallWait& wait, const PlantOptions& options)
-    : runtime_(std::make_shared<PlantRuntime>(std::move(plant), wait, options)),
-      netEnum_(std::make_unique<SimNetEnum>(runtime_)) {}
+    : runtime_(std::make_shared<PlantRuntime>(plant, wait, options)),
+      netEnum_(std::make_unique<SimNetEnum>(runtime_)),
+      ddeServers_(std::make_unique<SimDdeServers>(std::move(plant), wait.Events())) {}
 
 SimulatedPlant::~SimulatedPlant() = default;
+
+SimDdeServers& SimulatedPlant::DdeServers() {
+    return *ddeServers_;
+}
 
 platform::NetEnumApi& SimulatedPlant::NetEnum() {
     return *netEnum_;

@@ -16,10 +16,12 @@
 namespace cv::sim {
 
 class ServerInstance;
+class SimDdeServers;
 class SimNetEnum;
 
 // The simulated plant: a network of computers with OPC servers, described by
-// a plant file (PlantLoader.h), running on the window thread's event loop.
+// a plant file (PlantLoader.h), with DDE applications, running on the
+// window thread's event loop.
 // It creates the server objects of the automation interface, lists its
 // network through the network enumeration, and lets tests change the plant
 // while it runs.
@@ -39,6 +41,8 @@ class SimulatedPlant : public platform::OpcServerFactory {
     ErrorInfo CreateServer(std::unique_ptr<platform::OPCServer>& cServer) override;
     // The plant's network: providers, domains, computers and their shares.
     platform::NetEnumApi& NetEnum();
+    // The plant's DDE applications, which make the DDE links.
+    SimDdeServers& DdeServers();
 
     const PlantDescription& Description() const { return runtime_->Plant(); }
     // This computer's name on the simulated network.
@@ -79,6 +83,7 @@ class SimulatedPlant : public platform::OpcServerFactory {
 
     std::shared_ptr<PlantRuntime> runtime_;
     std::unique_ptr<SimNetEnum> netEnum_;
+    std::unique_ptr<SimDdeServers> ddeServers_;
 };
 
 }  // namespace cv::sim

@@ -1,0 +1,112 @@
+#include <memory>
+#include <string>
+
+#include "document/TunFile.h"
+#include "opc/CvOpcAutoClient.h"
+#include "platform/Platform.h"
+#include "util/ProgramRoutines.h"
+
+namespace cv {
+
+int32_t TunFile::Online(bool bTimedOut) {
+    const int32_t lArchives = mcArchives->Online(bTimedOut);
+    if (lArchives == OnlineState::Offline) {
+        return OnlineState::Offline;
+    }
+    const int32_t lSpecifics = mcSpecifics->Online(bTimedOut);
+    if (lArchives == OnlineState::GoingOnline || lSpecifics == OnlineState::GoingOnline) {
+        return OnlineState::GoingOnline;
+    }
+    return OnlineState::Online;
+}
+
+bool TunFile::GoOnline(bool bSilent) {
+    const bool bOk = mcArchives->CreateCommsObjects(*this, bSilent) &&
+                     mcSpecifics->CreateCommsObjects(*this, bSilent) &&
+                     mcArchives->GoOnline(*this, bSilent) && mcSpecifics->GoOnline(*this, bSilent);
+    if (!bOk) {
+        GoOffline();
+        return false;
+    }
+    OpcAutoGoOnline(mcGeneral->SIinMSec());
+    return true;
+}
+
+void TunFile::GoOffline() {
+    OpcAutoGoOffline();
+    mcArchives->GoOffline();
+    mcSpecifics->GoOffline();
+}
+
+bool TunFile::SingleShotRead() {
+    const char* sFault = nullptr;
+    if (mcGeneral->UseHotLinks()) {
+        sFault = " error: TunFile.SingleShotRead 1";
+    } else if (!mcArchives->IsOnline()) {
+        sFault = " error: TunFile.SingleShotRead 2";
+    }
+    if (sFault != nullptr) {
+        mPlatform.dialogs.MsgBox(mcTunerType.Name() + sFault, MsgBoxStyle::OKOnly, "");
+    } else if (mcArchives->SingleShotRead(*this) && mcSpecifics->SingleShotRead(*this)) {
+        return true;
+    }
+    GoOffline();
+    return false;
+}
+
+ErrorInfo TunFile::CreateOpcAutoObject(Channel& cChannel) {
+    CvOpcAutoClient* cClient = nullptr;
+    for (const std::unique_ptr<CvOpcAutoClient>& cEach : mcOpcClients) {
+        if (cEach->ServerID() == cChannel.OpcServerID() &&
+            cEach->ServerNode() == cChannel.OpcComputer()) {
+            cClient = cEach.get();
+            break;
+        }
+    }
+    if (cClient == nullptr) {
+        auto cNew = std::make_unique<CvOpcAutoClient>(mPlatform);
+        if (ErrorInfo error =
+                cNew->CreateServerAndGroup(cChannel.OpcServerID(), cChannel.OpcComputer())) {
+            return error;
+        }
+        cClient = cNew.get();
+        mcOpcClients.push_back(std::move(cNew));
+    }
+    return cClient->AddChannel(cChannel);
+}
+
+// A failing client is reported and the others still go online.
+void TunFile::OpcAutoGoOnline(int32_t lRate) {
+    const std::string sFault = ProgramTitle() + " Error: OpcAutoGoOnline";
+    for (size_t i = 0; i < mcOpcClients.size(); ++i) {
+        if (mcOpcClients[i]->UpdateRate(1, lRate)) {
+            mPlatform.dialogs.MsgBox(sFault, MsgBoxStyle::OKOnly, "");
+        }
+        if (i < mcOpcClients.size()) {
+            mcOpcClients[i]->Advise(1, true);
+        }
+    }
+}
+
+// Each client leaves the list before it ends, so events that run while it
+// waits on its server never meet a half-ended client there.
+void TunFile::OpcAutoGoOffline() {
+    while (!mcOpcClients.empty()) {
+        std::unique_ptr<CvOpcAutoClient> cClient = std::move(mcOpcClients.front());
+        mcOpcClients.erase(mcOpcClients.begin());
+        (void)cClient->GoOffline();
+    }
+}
+
+ErrorInfo TunFile::OpcAutoSingleShotRead(int32_t lGroup) {
+    for (size_t i = 0; i < mcOpcClients.size(); ++i) {
+        if (ErrorInfo error = mcOpcClients[i]->SingleShotReadGroup(lGroup)) {
+            mPlatform.dialogs.MsgBox(ProgramTitle() + " Error: OpcAutoSingleShotRead",
+                                     MsgBoxStyle::OKOnly, "");
+            return error;
+        }
+    }
+    return {};
+}
+
+}  // namespace cv
