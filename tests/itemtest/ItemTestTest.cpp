@@ -285,5 +285,23 @@ TEST_F(ItemTestTest, DecimalPlacesAndColourChangeTheChannel) {
     EXPECT_EQ(Shown().engColor, 0x0000FF);
 }
 
+TEST_F(ItemTestTest, ADdeChannelGoesOnlineInThePreparingStep) {
+    cChannel->SetComType(ComTypeCode::Dde);
+    cChannel->SetDdeAppTopic("PLC5|LIC20");
+    cChannel->SetItemName("PV");
+    cChannel->SetDescription("PV");
+    test = std::make_unique<ItemTest>(t.platform, cTunFile, *cChannel, *this);
+    test->Start();
+    t.events.Advance(100);
+    EXPECT_EQ(Shown().frameCaption, "DDE Item name: PV");
+    EXPECT_EQ(test->State(), 6) << "states 2 to 4 skipped";
+    EXPECT_FALSE(Shown().showTimeStamp);
+    EXPECT_FALSE(test->Progress().Visible());
+    t.events.Advance(1000);
+    EXPECT_EQ(Shown().instValue, "47.25");
+    EXPECT_EQ(Shown().ddeLabel, "47.25");
+    EXPECT_EQ(closes, 0);
+}
+
 }  // namespace
 }  // namespace cv
