@@ -155,3 +155,50 @@ TEST(PlantLoader, ABrokenOrMissingFileFallsBackToTheBuiltInPlantWithAMessage) {
 
 }  // namespace
 }  // namespace cv::sim
+
+namespace cv::sim {
+namespace {
+
+std::string WithDde(const std::string& apps) {
+    std::string text = Plant();
+    return text.substr(0, text.rfind('}')) + ", \"ddeApplications\": " + apps + "\n}\n";
+}
+
+TEST(PlantLoader, DdeApplicationsAreCheckedLikeTheRest) {
+    struct Case {
+        std::string apps;
+        std::string problem;  // empty: loads
+    };
+    const std::vector<Case> cases = {
+        {R"([ { "name": "PLC", "topics": [ { "name": "T", "items": { "A": "1" } } ] } ])", ""},
+        {R"([ { "name": "PLC", "answers": "sometimes" } ])",
+         "ddeApplications[0].answers: needs \"always\", \"never\" or \"late\""},
+        {R"([ { "name": "PLC", "topics": [ { "name": "T", "items": { "A": 1 } } ] } ])",
+         "ddeApplications[0].topics[0].items.A: needs a text in double quotes"},
+        {R"([ { "name": "PLC" }, { "name": "PLC" } ])",
+         "ddeApplications[1].name: \"PLC\" appears twice"},
+        {R"([ { "name": "PLC", "port": 5 } ])", "ddeApplications[0].port: unknown key"},
+    };
+    for (const Case& c : cases) {
+        SCOPED_TRACE(c.apps);
+        const std::string error = ErrorOf(WithDde(c.apps));
+        if (c.problem.empty()) {
+            EXPECT_EQ(error, "");
+        } else {
+            EXPECT_NE(error.find(c.problem), std::string::npos) << error;
+        }
+    }
+}
+
+TEST(PlantLoader, TheBuiltInPlantHasEveryKindOfDdeApplication) {
+    PlantPtr plant;
+    ASSERT_FALSE(ParsePlant(BuiltInPlantText(), "plant.json", plant));
+    std::set<DdeAnswer> answers;
+    for (const DdeAppSpec& app : plant->ddeApps) {
+        answers.insert(app.answer);
+    }
+    EXPECT_EQ(answers.size(), 3u);
+}
+
+}  // namespace
+}  // namespace cv::sim
