@@ -58,6 +58,8 @@ frmDDETest::frmDDETest(Platform& platform, TunFile& cTunFile, Channel& cChannel,
 
 frmDDETest::~frmDDETest() {
     mTest.Unload();
+    // The control shows the test's wait progress: it goes before the test.
+    delete mcProgress;
 }
 
 bool frmDDETest::DoIt(Platform& platform, TunFile& cTunFile, Channel& cChannel, int32_t lTop,
