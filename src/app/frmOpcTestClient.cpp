@@ -14,6 +14,7 @@
 #include "platform/Platform.h"
 #include "ui/browse/frmBrowseOpcServers.h"
 #include "ui/browse/frmOpcBrowse.h"
+#include "ui/test/frmDDETest.h"
 #include "ui/widgets/HelpTopics.h"
 #include "util/FloatText.h"
 #include "util/ProgramRoutines.h"
@@ -90,8 +91,7 @@ QGroupBox* frmOpcTestClient::CreateAddressFrame() {
     txtItemID = NewTextBox("txtItemID");
     cmdBrowseItems = NewButton("cmdBrowseItems", "Browse", "Browse for OPC Items");
     cmdTest = NewButton("cmdTest", "Test read");
-    // The test window comes later; until then its button cannot be used.
-    cmdTest->setEnabled(false);
+    connect(cmdTest, &QPushButton::clicked, this, [this] { cmdTest_Click(); });
     connect(cmdBrowseServers, &QPushButton::clicked, this, [this] { cmdBrowseServers_Click(); });
     connect(cmdBrowseItems, &QPushButton::clicked, this, [this] { cmdBrowseItems_Click(); });
 
@@ -249,6 +249,19 @@ void frmOpcTestClient::cmdBrowseServers_Click() {
         TestChannel().SetOpcNodeAndServer(sServer);
         txtServerID->setText(QString::fromStdString(sServer));
     }
+}
+
+// The test window opens where the copyright notice is, so that it covers the
+// lower part of this window and leaves the item's address in sight.
+void frmOpcTestClient::cmdTest_Click() {
+    if (!RunPendingValidations()) {
+        return;
+    }
+    TestChannel().SetDescription(TestChannel().ItemName());
+    General().SetScaleSP(General().ScalePVandCO());
+    const QPoint position = lblCopyright->mapToGlobal(QPoint(0, 0));
+    (void)frmDDETest::DoIt(mPlatform, mcTunFile, TestChannel(), position.y(), position.x(), false,
+                           this);  // the window's changes are in the channel already
 }
 
 void frmOpcTestClient::cmdBrowseItems_Click() {

@@ -52,6 +52,7 @@ class frmOpcTestClient : public QWidget {
     void chkUseScaling_Click();
     void cmdBrowseServers_Click();
     void cmdBrowseItems_Click();
+    void cmdTest_Click();
     void cmdHelp_Click();
     void cmdClose_Click();
 

@@ -13,6 +13,10 @@
 // found at a computer's discovery port: CVOPCTESTCLIENT_UA_DISCOVERY_PORT,
 // else the user's setting UaDiscoveryPort (HKEY_CURRENT_USER
 // Software\Corvalent\TestClient), else 4840.
+//
+//   cvopctestclient --test-read SERVER --item ID [options] | --help | --version
+//
+// reads an item on a terminal without a window (TestReadCommandLine.h).
 
 #include <cstdio>
 #include <cstdlib>
@@ -22,7 +26,9 @@
 
 #include <QApplication>
 
+#include "app/TestReadProgram.h"
 #include "app/frmOpcTestClient.h"
+#include "itemtest/TestReadCommandLine.h"
 #include "platform/Platform.h"
 #include "platform/ServerCallWait.h"
 #include "platform/TraceLog.h"
@@ -36,21 +42,15 @@
 #include "platform/qt/QtDialogs.h"
 #include "platform/qt/QtEventLoop.h"
 #include "platform/qt/QtLocale.h"
-#include "platform/qt/QtModelessMessages.h"
 #include "platform/sim/PlantLoader.h"
 #include "platform/sim/SimDdeServers.h"
 #include "platform/sim/SimulatedPlant.h"
 #include "platform/ua/UaBackend.h"
 #include "stores/RegClass.h"
+#include "ui/widgets/ModelessMessageForms.h"
 #include "util/ProgramRoutines.h"
 
 namespace {
-
-constexpr const char* kUsage =
-    "usage: cvopctestclient [--plant FILE] [--quit-when-shown] [Qt options]\n"
-    "  --plant FILE       simulate the plant FILE describes instead of the built-in one\n"
-    "                     (or set CVOPCTESTCLIENT_PLANT=FILE)\n"
-    "  --quit-when-shown  end as soon as the main window has been drawn (start-up timing)\n";
 
 bool IsSet(const char* variable) {
     const char* value = std::getenv(variable);
@@ -103,9 +103,14 @@ int main(int argc, char** argv) {
         if (argument == "--quit-when-shown") {
             quitWhenShown = true;
         } else if (argument == "--help" || argument == "-h") {
-            std::fputs(kUsage, stdout);
+            std::fputs(cv::kWindowUsage, stdout);
+            std::fputs(cv::TestReadUsage().c_str(), stdout);
             return 0;
         }
+    }
+    // A test read on a terminal needs no display.
+    if (cv::WantsTestRead(arguments)) {
+        return cv::RunTestReadProgram(arguments);
     }
     if (!HasDisplay(argc, argv)) {
         std::fputs(
@@ -137,11 +142,12 @@ int main(int argc, char** argv) {
     cv::uaopc::UaBackend ua(serverCalls, uaOptions);
     cv::platform::RoutingServerFactory servers(plant, ua);
     cv::platform::TraceLog trace;
-    cv::qtui::QtModelessMessages modeless(cv::ProgramTitle());
+    cv::ModelessMessageForms modeless;
     cv::Platform platform{
         dialogs,  locale, program, help,        computer, events,          registry,
         profiles, run,    servers, serverCalls, trace,    plant.NetEnum(), plant.DdeServers(),
         modeless};
+    modeless.SetPlatform(platform);
     if (!choice.message.empty()) {
         dialogs.MsgBox(choice.message, cv::MsgBoxStyle::Exclamation, "");
     }

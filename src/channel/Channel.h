@@ -193,6 +193,8 @@ class Channel {
     bool OpcIsActive() const;
     int16_t OpcRawValueVarType() const;
     double OpcTimeStamp() const;
+    // The OPC quality word of the last value, without the channel's own marks.
+    int32_t OpcQuality() const { return mlQuality & 0xF7FF; }
 
     // The plain-words diagnosis of sOverride, or of currentError when
     // sOverride is empty. A DDE time-out sets lButtons to Yes/No and asks

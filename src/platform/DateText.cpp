@@ -105,15 +105,38 @@ std::string_view DayName(int32_t weekday, bool abbreviated) {
     return abbreviated ? name.substr(0, 3) : name;
 }
 
-ErrorInfo WriteOleDate(double oleDate, const platform::Locale& locale, std::string& text) {
+namespace {
+
+// The date's parts rounded to the second (down where rounding up would
+// leave the range).
+std::optional<OleDateParts> SecondParts(double oleDate) {
     const std::optional<OleTimePoint> exact = OleDateToTimePoint(oleDate);
     if (!exact) {
-        return InvalidArgumentError();
+        return std::nullopt;
     }
     std::optional<OleDateParts> parts =
         OleTimePointToParts(std::chrono::round<std::chrono::seconds>(*exact));
     if (!parts) {
         parts = OleTimePointToParts(std::chrono::floor<std::chrono::seconds>(*exact));
+    }
+    return parts;
+}
+
+}  // namespace
+
+ErrorInfo WriteOleDateAs(double oleDate, std::string_view format, std::string& text) {
+    const std::optional<OleDateParts> parts = SecondParts(oleDate);
+    if (!parts) {
+        return InvalidArgumentError();
+    }
+    text = ApplyFormat(format, *parts);
+    return {};
+}
+
+ErrorInfo WriteOleDate(double oleDate, const platform::Locale& locale, std::string& text) {
+    const std::optional<OleDateParts> parts = SecondParts(oleDate);
+    if (!parts) {
+        return InvalidArgumentError();
     }
     const bool timeOnly = parts->year == 1899 && parts->month == 12 && parts->day == 30;
     const bool dateOnly = parts->hour == 0 && parts->minute == 0 && parts->second == 0;

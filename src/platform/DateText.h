@@ -21,6 +21,9 @@ class Locale;
 // argument) for a date outside 0100-01-01..9999-12-31.
 ErrorInfo WriteOleDate(double oleDate, const platform::Locale& locale, std::string& text);
 
+// The date in one format of the regional kind ("h:mm:ss tt", "M/d/yyyy"),
+// rounded to the second. Fails like WriteOleDate.
+ErrorInfo WriteOleDateAs(double oleDate, std::string_view format, std::string& text);
 // Reads a date, a time or both: three numbers in the order of the short-date
 // format (or year first when it has three or four digits), or a month name
 // with a day and a year; a time of hours and minutes with optional seconds

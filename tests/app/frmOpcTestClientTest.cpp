@@ -104,8 +104,7 @@ class frmOpcTestClientTest : public QObject {
         QCOMPARE(window->windowTitle(), QStringLiteral("Corvalent OPC Test Client"));
         QCOMPARE(Box<QLabel>("lblVersion")->text(), QStringLiteral("Version 13.2.1"));
         QCOMPARE(Box<QLabel>("lblCopyright")->text(), QStringLiteral("Copyright (C) Corvalent"));
-        // Until its window exists.
-        QVERIFY(!Box<QWidget>("cmdTest")->isEnabled());
+        QVERIFY(Box<QWidget>("cmdTest")->isEnabled());
         QVERIFY(Box<QWidget>("cmdBrowseServers")->isEnabled());
         QVERIFY(Box<QWidget>("cmdBrowseItems")->isEnabled());
 

@@ -1,0 +1,89 @@
+#include "app/TestReadProgram.h"
+
+#include <cstdlib>
+#include <iostream>
+
+#include "itemtest/CommandLineTestRead.h"
+#include "itemtest/TestReadCommandLine.h"
+#include "platform/Platform.h"
+#include "platform/ServerCallWait.h"
+#include "platform/TraceLog.h"
+#include "platform/posix/ConsoleBusyNotice.h"
+#include "platform/posix/ConsoleDialogs.h"
+#include "platform/posix/ConsoleHelp.h"
+#include "platform/posix/ConsoleLocale.h"
+#include "platform/posix/ConsoleModeless.h"
+#include "platform/posix/FileProfiles.h"
+#include "platform/posix/FileRegistry.h"
+#include "platform/posix/HostComputerName.h"
+#include "platform/posix/PosixProgramInfo.h"
+#include "platform/posix/SteadyEventLoop.h"
+#include "platform/sim/PlantLoader.h"
+#include "platform/sim/SimDdeServers.h"
+#include "platform/sim/SimulatedPlant.h"
+
+namespace cv {
+
+const char* const kWindowUsage =
+    "usage: cvopctestclient [--plant FILE] [--quit-when-shown] [Qt options]\n"
+    "  --plant FILE       simulate the plant FILE describes instead of the built-in one\n"
+    "                     (or set CVOPCTESTCLIENT_PLANT=FILE)\n"
+    "  --quit-when-shown  end as soon as the main window has been drawn (start-up timing)\n"
+    "\n";
+
+namespace {
+
+int Run(const TestReadOptions& options, const std::vector<std::string>& arguments) {
+    const sim::PlantChoice choice = sim::ChoosePlant(
+        sim::UserPlantFile(arguments, std::getenv(sim::kPlantEnvironmentVariable)));
+    if (!choice.message.empty()) {
+        std::cerr << posix::ConsoleDialogs::PlainLines(choice.message) << '\n';
+        return TestReadExit::kPlantUnusable;
+    }
+    posix::ConsoleDialogs dialogs(std::cerr);
+    posix::ConsoleLocale locale;
+    posix::PosixProgramInfo program;
+    posix::ConsoleHelp help(std::cerr);
+    posix::HostComputerName computer;
+    posix::SteadyEventLoop events;
+    posix::FileRegistry registry;
+    posix::FileProfiles profiles;
+    RunSwitches run;
+    posix::ConsoleBusyNotice busy(std::cerr);
+    platform::ServerCallWait serverCalls(events, busy);
+    sim::SimulatedPlant plant(choice.plant, serverCalls,
+                              sim::PlantOptions{computer.Query().value_or(""), {}});
+    platform::TraceLog trace;
+    posix::ConsoleModeless modeless(std::cerr);
+    Platform platform{
+        dialogs,  locale, program, help,        computer, events,          registry,
+        profiles, run,    plant,   serverCalls, trace,    plant.NetEnum(), plant.DdeServers(),
+        modeless};
+    return CommandLineTestRead(platform, options, std::cout).Run();
+}
+
+}  // namespace
+
+int RunTestReadProgram(const std::vector<std::string>& arguments) {
+    const TestReadCommand command = ParseTestReadCommand(arguments);
+    switch (command.action) {
+        case TestReadCommand::Action::Help:
+            std::cout << kWindowUsage << TestReadUsage();
+            return TestReadExit::kValuesRead;
+        case TestReadCommand::Action::Version: {
+            const posix::PosixProgramInfo program;
+            std::cout << "cvopctestclient " << program.VersionMajor() << '.'
+                      << program.VersionMinor() << '.' << program.VersionRevision() << '\n';
+            return TestReadExit::kValuesRead;
+        }
+        case TestReadCommand::Action::Usage:
+            std::cerr << "cvopctestclient: " << command.error
+                      << "\nTry 'cvopctestclient --help' for more information.\n";
+            return TestReadExit::kUsage;
+        case TestReadCommand::Action::Run:
+            break;
+    }
+    return Run(command.options, arguments);
+}
+
+}  // namespace cv

@@ -1,0 +1,44 @@
+#pragma once
+
+#include <cstdint>
+#include <iosfwd>
+
+#include "itemtest/ItemTest.h"
+#include "itemtest/TestReadCommandLine.h"
+
+namespace cv {
+
+class Channel;
+struct Platform;
+
+// The test read without a window: the same item test as the window's, on
+// the document the main window would make, printing one line per value:
+//
+//   2025-01-01T00:00:01.000<TAB>12.5<TAB>53.13<TAB>good
+//
+// (the server's time stamp, the raw value, the scaled value with the
+// channel's decimal places, the quality in words). Failures are told by the
+// platform's dialogs, as the window tells them.
+class CommandLineTestRead : private ItemTest::Listener {
+  public:
+    CommandLineTestRead(Platform& platform, const TestReadOptions& options, std::ostream& out);
+
+    // Runs until the values were read or the test failed; the exit code.
+    int Run();
+
+  private:
+    void Configure(TunFile& cTunFile, Channel& cChannel) const;
+    void DisplayChanged() override {}
+    void CloseRequested() override { mbFailed = true; }
+    void ValuesShown() override;
+
+    Platform& mPlatform;
+    const TestReadOptions& mOptions;
+    std::ostream& mOut;
+    Channel* mcChannel = nullptr;
+    ItemTest* mcTest = nullptr;
+    int32_t mlShown = 0;
+    bool mbFailed = false;
+};
+
+}  // namespace cv

@@ -1,0 +1,154 @@
+// The command-line test read as a user meets it: the built program run as a
+// process, without a display, its output and exit code read back.
+
+#include <fcntl.h>
+#include <spawn.h>
+#include <sys/wait.h>
+#include <unistd.h>
+
+#include <gtest/gtest.h>
+
+#include <fstream>
+#include <regex>
+#include <sstream>
+#include <string>
+#include <vector>
+
+#include "support/TempFolder.h"
+
+extern char** environ;
+
+namespace {
+
+struct Outcome {
+    int exitCode = -1;
+    std::string out;
+    std::string err;
+};
+
+std::string ReadAll(const std::string& path) {
+    std::ifstream file(path);
+    std::stringstream text;
+    text << file.rdbuf();
+    return text.str();
+}
+
+// Runs the program with the arguments, no display and settings of its own.
+Outcome RunProgram(std::vector<std::string> arguments) {
+    const cv::test::TempFolder folder;
+    std::vector<std::string> environment;
+    for (char** variable = environ; *variable != nullptr; ++variable) {
+        const std::string entry(*variable);
+        if (entry.rfind("DISPLAY=", 0) != 0 && entry.rfind("WAYLAND_DISPLAY=", 0) != 0 &&
+            entry.rfind("QT_QPA_PLATFORM=", 0) != 0 && entry.rfind("CVOPCTESTCLIENT_", 0) != 0) {
+            environment.push_back(entry);
+        }
+    }
+    environment.push_back("CVOPCTESTCLIENT_CONFIG_DIR=" + folder.Path());
+    std::vector<char*> envp;
+    for (auto& variable : environment) {
+        envp.push_back(variable.data());
+    }
+    envp.push_back(nullptr);
+    std::string program = CV_PROGRAM_PATH;
+    arguments.insert(arguments.begin(), program);
+    std::vector<char*> argv;
+    for (auto& argument : arguments) {
+        argv.push_back(argument.data());
+    }
+    argv.push_back(nullptr);
+    const std::string outPath = folder.File("out");
+    const std::string errPath = folder.File("err");
+    posix_spawn_file_actions_t actions;
+    posix_spawn_file_actions_init(&actions);
+    posix_spawn_file_actions_addopen(&actions, STDOUT_FILENO, outPath.c_str(),
+                                     O_WRONLY | O_CREAT | O_TRUNC, 0600);
+    posix_spawn_file_actions_addopen(&actions, STDERR_FILENO, errPath.c_str(),
+                                     O_WRONLY | O_CREAT | O_TRUNC, 0600);
+    pid_t pid = 0;
+    Outcome outcome;
+    if (posix_spawn(&pid, program.c_str(), &actions, nullptr, argv.data(), envp.data()) == 0) {
+        int status = 0;
+        if (waitpid(pid, &status, 0) == pid && WIFEXITED(status)) {
+            outcome.exitCode = WEXITSTATUS(status);
+        }
+    }
+    posix_spawn_file_actions_destroy(&actions);
+    outcome.out = ReadAll(outPath);
+    outcome.err = ReadAll(errPath);
+    return outcome;
+}
+
+std::vector<std::string> Lines(const std::string& text) {
+    std::vector<std::string> lines;
+    std::istringstream stream(text);
+    for (std::string line; std::getline(stream, line);) {
+        lines.push_back(line);
+    }
+    return lines;
+}
+
+TEST(TestReadProcess, PrintsOneLinePerValueAndExitsZero) {
+    const Outcome outcome =
+        RunProgram({"--test-read", "Sim.Plant.1", "--item", "Types.ReadOnly.R8", "--count", "3",
+                    "--interval", "0.1", "--scale", "0:10:0:100"});
+    EXPECT_EQ(outcome.exitCode, 0) << outcome.err;
+    const std::vector<std::string> lines = Lines(outcome.out);
+    ASSERT_EQ(lines.size(), 3u) << outcome.out;
+    const std::regex line(
+        R"(\d{4}-\d\d-\d\dT\d\d:\d\d:\d\d\.\d{3}\t2\.71828182845905\t27\.18\tgood)");
+    for (const std::string& text : lines) {
+        EXPECT_TRUE(std::regex_match(text, line)) << text;
+    }
+}
+
+TEST(TestReadProcess, FailuresPrintTheDiagnosisAndExitOne) {
+    struct Case {
+        std::vector<std::string> arguments;
+        std::string diagnosis;
+    };
+    const Case cases[] = {
+        {{"--test-read", "Sim.Plant.1", "--item", "No.Such.Item", "--timeout", "0.3"},
+         "Either the Access Path or the Item Name are unknown to the OPC Server."},
+        {{"--test-read", "\\\\.\\Sim.Nothing.1", "--item", "X", "--timeout", "0.3"},
+         "Server ID \"Sim.Nothing.1\" is not registered as an OPC Server"},
+        {{"--test-read", "Sim.Plant.1", "--item", "Quality.CommFailure", "--timeout", "0.3"},
+         "Communications failure"},
+        {{"--test-read", "Sim.Plant.1", "--item", "Special.PathItem", "--access-path", "COM9",
+          "--timeout", "0.3"},
+         "The Item's access path is not known to the OPC Server."},
+    };
+    for (const Case& c : cases) {
+        const Outcome outcome = RunProgram(c.arguments);
+        EXPECT_EQ(outcome.exitCode, 1) << c.diagnosis;
+        EXPECT_EQ(outcome.out, "");
+        EXPECT_NE(outcome.err.find(c.diagnosis), std::string::npos) << outcome.err;
+    }
+}
+
+TEST(TestReadProcess, UsageHelpVersionAndPlantFile) {
+    struct Case {
+        std::vector<std::string> arguments;
+        int exitCode;
+        std::string out;
+        std::string err;
+    };
+    const Case cases[] = {
+        {{"--help"}, 0, "--test-read SERVER", ""},
+        {{"--version"}, 0, "cvopctestclient ", ""},
+        {{"--test-read", "S"}, 2, "", "--test-read and --item are both needed"},
+        {{"--test-read", "S", "--item", "X", "--interval", "99"}, 2, "", "--interval must be"},
+        {{"--test-read", "S", "--item", "X", "--plant", "/nonexistent/plant.json"},
+         3,
+         "",
+         "/nonexistent/plant.json"},
+    };
+    for (const Case& c : cases) {
+        const Outcome outcome = RunProgram(c.arguments);
+        EXPECT_EQ(outcome.exitCode, c.exitCode) << outcome.err;
+        EXPECT_NE(outcome.out.find(c.out), std::string::npos) << outcome.out;
+        EXPECT_NE(outcome.err.find(c.err), std::string::npos) << outcome.err;
+    }
+}
+
+}  // namespace
