@@ -56,10 +56,12 @@ void PlantPerSimulatedSecond(benchmark::State& state) {
     sim::SimulatedPlant plant(PlantOf(kItems, state.range(0) != 0), wait,
                               sim::PlantOptions{"HERE", 45658.0});
     std::unique_ptr<platform::OPCServer> server;
-    plant.CreateServer(server);
-    server->Connect("Bench.1", "");
     std::shared_ptr<platform::OPCGroup> group;
-    server->OPCGroups().Add("bench", group);
+    if (plant.CreateServer(server) || server->Connect("Bench.1", "") ||
+        server->OPCGroups().Add("bench", group)) {
+        state.SkipWithError("the bench server could not be set up");
+        return;
+    }
     OneBased<std::string> ids;
     OneBased<int32_t> handles;
     for (int32_t i = 0; i < kItems; ++i) {
@@ -68,13 +70,18 @@ void PlantPerSimulatedSecond(benchmark::State& state) {
     }
     OneBased<int32_t> serverHandles;
     OneBased<int32_t> errors;
-    group->OPCItems().AddItems(kItems, ids, handles, OneBased<std::string>(), serverHandles,
-                               errors);
+    if (group->OPCItems().AddItems(kItems, ids, handles, OneBased<std::string>(), serverHandles,
+                                   errors)) {
+        state.SkipWithError("the bench items could not be added");
+        return;
+    }
     int64_t delivered = 0;
     group->SetDataChangeHandler(
         [&delivered](const platform::DataChangeArgs& args) { delivered += args.NumItems; });
-    group->SetUpdateRate(100);
-    group->SetIsSubscribed(true);
+    if (group->SetUpdateRate(100) || group->SetIsSubscribed(true)) {
+        state.SkipWithError("the bench group could not be subscribed");
+        return;
+    }
     events.Advance(1000);
     delivered = 0;
     for (auto _ : state) {
