@@ -24,14 +24,14 @@ ErrorInfo Connection::Connect(const std::string& progId, const std::string& node
     const bool registered =
         std::any_of(computer->servers.begin(), computer->servers.end(),
                     [&](const std::string& id) { return EqualsIgnoringCase(id, progId); });
-    const ServerSpec* spec = registered ? runtime_->Plant().FindServer(progId) : nullptr;
-    if (spec == nullptr || progId.empty()) {
+    const ServerSpec* described = registered ? runtime_->Plant().FindServer(progId) : nullptr;
+    if (described == nullptr || progId.empty()) {
         return ServerError(E_FAIL);
     }
-    if (!spec->running) {
+    if (!described->running) {
         return ServerError(CO_E_SERVER_EXEC_FAILURE);
     }
-    const auto server = runtime_->Instance(*computer, *spec);
+    const auto server = runtime_->Instance(*computer, *described);
     if (const ErrorInfo error = runtime_->Delay(server->CallDelay())) {
         return error;
     }

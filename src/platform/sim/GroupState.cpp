@@ -16,8 +16,9 @@ GroupState::GroupState(const std::shared_ptr<Connection>& connection, std::strin
     : connection_(connection),
       runtime_(connection->SharedRuntime()),
       name_(std::move(name)),
-      rate_(std::max<int32_t>(kDefaultUpdateRateMs,
-                              static_cast<int32_t>(connection->Server().Spec().minUpdateRateMs))) {}
+      rate_(std::max<int32_t>(
+          kDefaultUpdateRateMs,
+          static_cast<int32_t>(connection->Server().Described().minUpdateRateMs))) {}
 
 GroupState::~GroupState() {
     runtime_->Events().StopTimer(timer_);
@@ -75,7 +76,7 @@ ErrorInfo GroupState::SetSubscribed(bool subscribed) {
     if (const ErrorInfo error = Call()) {
         return error;
     }
-    if (subscribed && !connection_.lock()->Server().Spec().subscribable) {
+    if (subscribed && !connection_.lock()->Server().Described().subscribable) {
         return ServerError(SimResult::CONNECT_E_CANNOTCONNECT);
     }
     subscribed_ = subscribed;
@@ -89,7 +90,8 @@ ErrorInfo GroupState::SetUpdateRate(int32_t rate) {
     if (rate < 0) {
         return ServerError(E_INVALIDARG);
     }
-    const auto fastest = static_cast<int32_t>(connection_.lock()->Server().Spec().minUpdateRateMs);
+    const auto fastest =
+        static_cast<int32_t>(connection_.lock()->Server().Described().minUpdateRateMs);
     const int32_t revised = std::max(rate, fastest);
     if (revised != rate_) {
         rate_ = revised;

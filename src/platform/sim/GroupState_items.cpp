@@ -62,18 +62,18 @@ int32_t GroupState::AddOne(const std::string& itemId, int32_t clientHandle,
         return OPC_E_INVALIDITEMID;
     }
     const auto connection = connection_.lock();
-    const ServerSpec& server = connection->Server().Spec();
-    const ItemSpec* spec = server.FindItem(itemId);
-    if (spec == nullptr) {
+    const ServerSpec& server = connection->Server().Described();
+    const ItemSpec* described = server.FindItem(itemId);
+    if (described == nullptr) {
         return OPC_E_UNKNOWNITEMID;
     }
-    if (!PathAccepted(*spec, accessPath)) {
+    if (!PathAccepted(*described, accessPath)) {
         return OPC_E_UNKNOWNPATH;
     }
     auto item = std::make_shared<GroupItemState>();
     item->serverHandle = connection->NewServerHandle();
     item->clientHandle = clientHandle;
-    item->item = server.IndexOf(*spec);
+    item->item = server.IndexOf(*described);
     item->itemId = itemId;
     items_.push_back(item);
     byHandle_[item->serverHandle] = item;

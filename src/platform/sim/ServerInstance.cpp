@@ -129,16 +129,16 @@ void ServerInstance::End(int32_t code, const std::string* reason) {
 
 const ItemRuntime& ServerInstance::Observe(size_t item) {
     ItemRuntime& runtime = items_[item];
-    const ItemSpec& spec = server_.items[item];
+    const ItemSpec& described = server_.items[item];
     if (!seen_[item]) {
         seen_[item] = true;
-        runtime.value = spec.value;
-        runtime.quality = spec.quality;
+        runtime.value = described.value;
+        runtime.quality = described.quality;
         runtime.stampMs = runtime_.Clock().NowMs();
         runtime.version = 1;
     }
-    if (!runtime.fixed && spec.generator.MovesWithTime()) {
-        GeneratedSample sample = Generate(spec, runtime_.Clock().NowMs());
+    if (!runtime.fixed && described.generator.MovesWithTime()) {
+        GeneratedSample sample = Generate(described, runtime_.Clock().NowMs());
         Update(runtime, std::move(sample.value), runtime.forcedQuality.value_or(sample.quality));
     }
     return runtime;

@@ -37,7 +37,7 @@ class ServerInstance {
     ServerInstance(const ServerInstance&) = delete;
     ServerInstance& operator=(const ServerInstance&) = delete;
 
-    const ServerSpec& Spec() const { return server_; }
+    const ServerSpec& Described() const { return server_; }
     uint32_t CallDelay() const { return callDelayMs_; }
     void SetCallDelay(uint32_t ms) { callDelayMs_ = ms; }
 

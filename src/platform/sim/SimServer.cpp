@@ -51,7 +51,7 @@ ErrorInfo SimServer::CreateBrowser(std::shared_ptr<platform::OPCBrowser>& cBrows
     if (const ErrorInfo error = connection->Call()) {
         return error;
     }
-    const ServerSpec& server = connection->Server().Spec();
+    const ServerSpec& server = connection->Server().Described();
     if (!server.browsable) {
         return ServerError(SimResult::E_NOINTERFACE);
     }

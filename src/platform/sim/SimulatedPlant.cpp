@@ -65,11 +65,11 @@ ErrorInfo SimulatedPlant::FindItem(const std::string& node, const std::string& s
     if (const ErrorInfo error = Find(node, serverId, instance)) {
         return error;
     }
-    const ItemSpec* spec = instance->Spec().FindItem(itemId);
-    if (spec == nullptr) {
+    const ItemSpec* described = instance->Described().FindItem(itemId);
+    if (described == nullptr) {
         return {E_INVALIDARG, "The server \"" + serverId + "\" has no item \"" + itemId + "\"."};
     }
-    item = instance->Spec().IndexOf(*spec);
+    item = instance->Described().IndexOf(*described);
     return {};
 }
 

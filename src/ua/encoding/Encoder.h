@@ -17,7 +17,6 @@ class Encoder {
   public:
     explicit Encoder(std::string& out) : out_(out) {}
 
-
     void operator()(bool v) { Byte(v ? 1 : 0); }
     void operator()(int8_t v) { Byte(static_cast<uint8_t>(v)); }
     void operator()(uint8_t v) { Byte(v); }

@@ -55,8 +55,8 @@ inline const crypto::Credentials& LargeKeyCredentials() {
 // Changes a certificate made by CreateSelfSigned and signs it again with
 // the key of by (its own when by is empty): to make authorities and the
 // certificates they issue.
-inline crypto::Credentials Resigned(const crypto::Credentials& made,
-                                    const crypto::Credentials& by, bool authority) {
+inline crypto::Credentials Resigned(const crypto::Credentials& made, const crypto::Credentials& by,
+                                    bool authority) {
     const crypto::Credentials& signer = by.key.Empty() ? made : by;
     X509* x509 = X509_dup(made.certificate.Get());
     for (const int nid : {NID_basic_constraints, NID_authority_key_identifier}) {
