@@ -8,6 +8,7 @@
 #include "platform/Platform.h"
 #include "platform/ServerCallWait.h"
 #include "platform/TraceLog.h"
+#include "platform/opc/RoutingServerFactory.h"
 #include "platform/posix/ConsoleBusyNotice.h"
 #include "platform/posix/ConsoleDialogs.h"
 #include "platform/posix/ConsoleHelp.h"
@@ -21,6 +22,7 @@
 #include "platform/sim/PlantLoader.h"
 #include "platform/sim/SimDdeServers.h"
 #include "platform/sim/SimulatedPlant.h"
+#include "platform/ua/UaBackend.h"
 
 namespace cv {
 
@@ -53,13 +55,16 @@ int Run(const TestReadOptions& options, const std::vector<std::string>& argument
     platform::ServerCallWait serverCalls(events, busy);
     sim::SimulatedPlant plant(choice.plant, serverCalls,
                               sim::PlantOptions{computer.Query().value_or(""), {}});
+    // Endpoint URLs go to OPC UA servers, every other server ID to the plant.
+    uaopc::UaBackend ua(serverCalls);
+    platform::RoutingServerFactory servers(plant, ua);
     platform::TraceLog trace;
     posix::ConsoleModeless modeless(std::cerr);
     Platform platform{
         dialogs,  locale, program, help,        computer, events,          registry,
-        profiles, run,    plant,   serverCalls, trace,    plant.NetEnum(), plant.DdeServers(),
+        profiles, run,    servers, serverCalls, trace,    plant.NetEnum(), plant.DdeServers(),
         modeless};
-    return CommandLineTestRead(platform, options, std::cout).Run();
+    return CommandLineTestRead(platform, options, std::cout, std::cerr).Run();
 }
 
 }  // namespace

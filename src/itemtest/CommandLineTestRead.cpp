@@ -34,8 +34,8 @@ std::string IsoTime(double dStamp) {
 }  // namespace
 
 CommandLineTestRead::CommandLineTestRead(Platform& platform, const TestReadOptions& options,
-                                         std::ostream& out)
-    : mPlatform(platform), mOptions(options), mOut(out) {}
+                                         std::ostream& out, std::ostream& err)
+    : mPlatform(platform), mOptions(options), mOut(out), mErr(err) {}
 
 void CommandLineTestRead::Configure(TunFile& cTunFile, Channel& cChannel) const {
     cChannel.SetOpcNodeAndServer(mOptions.nodeAndServer);
@@ -72,6 +72,15 @@ int CommandLineTestRead::Run() {
     test.Unload();
     mcTest = nullptr;
     return mbFailed ? TestReadExit::kTestFailed : TestReadExit::kValuesRead;
+}
+
+void CommandLineTestRead::DisplayChanged() {
+    if (mbBackendTold || mcTest == nullptr || mcTest->Display().backend.empty()) {
+        return;
+    }
+    mbBackendTold = true;
+    mErr << "Backend: " << mcTest->Display().backend << '\n';
+    mErr.flush();
 }
 
 void CommandLineTestRead::ValuesShown() {

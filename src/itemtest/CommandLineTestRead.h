@@ -17,28 +17,33 @@ struct Platform;
 //   2025-01-01T00:00:01.000<TAB>12.5<TAB>53.13<TAB>good
 //
 // (the server's time stamp, the raw value, the scaled value with the
-// channel's decimal places, the quality in words). Failures are told by the
-// platform's dialogs, as the window tells them.
+// channel's decimal places, the quality in words). Once the server is
+// reached, err gets the kind of server that answered, as "Backend: OPC UA"
+// or "Backend: simulated plant". Failures are told by the platform's
+// dialogs, as the window tells them.
 class CommandLineTestRead : private ItemTest::Listener {
   public:
-    CommandLineTestRead(Platform& platform, const TestReadOptions& options, std::ostream& out);
+    CommandLineTestRead(Platform& platform, const TestReadOptions& options, std::ostream& out,
+                        std::ostream& err);
 
     // Runs until the values were read or the test failed; the exit code.
     int Run();
 
   private:
     void Configure(TunFile& cTunFile, Channel& cChannel) const;
-    void DisplayChanged() override {}
+    void DisplayChanged() override;
     void CloseRequested() override { mbFailed = true; }
     void ValuesShown() override;
 
     Platform& mPlatform;
     const TestReadOptions& mOptions;
     std::ostream& mOut;
+    std::ostream& mErr;
     Channel* mcChannel = nullptr;
     ItemTest* mcTest = nullptr;
     int32_t mlShown = 0;
     bool mbFailed = false;
+    bool mbBackendTold = false;
 };
 
 }  // namespace cv

@@ -2,6 +2,7 @@
 
 #include "channel/Channel.h"
 #include "document/TunFile.h"
+#include "opc/CvOpcAutoClient.h"
 #include "platform/Platform.h"
 
 namespace cv {
@@ -125,7 +126,9 @@ void ItemTest::Create() {
     }
     int32_t lButtons = MsgBoxStyle::Exclamation;
     std::string sText;
-    if (mcChannel.CreateCommsObjects(mcTunFile, lButtons, sText, true)) {
+    const bool bCreated = mcChannel.CreateCommsObjects(mcTunFile, lButtons, sText, true);
+    NoteBackend();
+    if (bCreated) {
         miState = 4;
         return;
     }
@@ -140,7 +143,9 @@ void ItemTest::RetryCreate() {
     int32_t lButtons = MsgBoxStyle::Exclamation;
     std::string sText;
     // Silent until the wait is up: the last attempt shows its diagnosis.
-    if (mcChannel.CreateCommsObjects(mcTunFile, lButtons, sText, !bTimeUp)) {
+    const bool bCreated = mcChannel.CreateCommsObjects(mcTunFile, lButtons, sText, !bTimeUp);
+    NoteBackend();
+    if (bCreated) {
         mProgress.SetVisible(false);
         miState = 4;
     } else if (bTimeUp && !mbUnloaded) {
@@ -211,6 +216,22 @@ void ItemTest::ShowReadError(const std::string& sPrefix, int32_t lIcon) {
     }
     const std::string sText = mcChannel.GetErrorString(sError, lButtons, sQuestion, ErrorInfo{});
     (void)mPlatform.dialogs.MsgBox(sText, lButtons + lIcon, sPrefix + mcChannel.Description());
+}
+
+// The client of the channel's server exists once connected, even when the
+// server refused the item.
+void ItemTest::NoteBackend() {
+    if (!mDisplay.backend.empty()) {
+        return;
+    }
+    for (const std::unique_ptr<CvOpcAutoClient>& cClient : mcTunFile.OpcClients()) {
+        if (cClient->ServerID() == mcChannel.OpcServerID() &&
+            cClient->ServerNode() == mcChannel.OpcComputer()) {
+            mDisplay.backend = cClient->BackendName();
+            Notify();
+            return;
+        }
+    }
 }
 
 void ItemTest::SetBusy(int16_t iPointer) {

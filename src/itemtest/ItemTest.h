@@ -100,6 +100,7 @@ class ItemTest {
     void Refresh();
     void Close();
     void SetBusy(int16_t iPointer);
+    void NoteBackend();
     void ShowReadError(const std::string& sPrefix, int32_t lIcon);
     void StartTimer(uint32_t lIntervalMs);
 

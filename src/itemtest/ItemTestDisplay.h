@@ -10,6 +10,9 @@ namespace cv {
 // window whenever it changes.
 struct ItemTestDisplay {
     std::string caption = "Trying to connect...";
+    // Which kind of OPC server the test reached ("OPC UA", "simulated
+    // plant"), kept once known; empty before that and for DDE.
+    std::string backend;
     // fraTestItem's caption.
     std::string frameCaption;
     // The DDE label's text (a DDE item's value as the link last gave it).

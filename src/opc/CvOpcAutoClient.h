@@ -43,6 +43,9 @@ class CvOpcAutoClient {
     // The server's ID and computer; empty without a server.
     std::string ServerID() const;
     std::string ServerNode() const;
+    // Which kind of server it talks to ("OPC UA", "simulated plant"); empty
+    // without a server.
+    std::string BackendName() const { return mcOpcServer ? mcOpcServer->BackendName() : ""; }
     // Group 2 for 2, else group 1.
     ErrorInfo UpdateRate(int32_t lGroup, int32_t lRate);
     // Group 1: active or not. Group 2: subscribed or not (and inactive).

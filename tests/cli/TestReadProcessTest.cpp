@@ -8,6 +8,7 @@
 
 #include <gtest/gtest.h>
 
+#include <cstdlib>
 #include <fstream>
 #include <regex>
 #include <sstream>
@@ -93,6 +94,7 @@ TEST(TestReadProcess, PrintsOneLinePerValueAndExitsZero) {
         RunProgram({"--test-read", "Sim.Plant.1", "--item", "Types.ReadOnly.R8", "--count", "3",
                     "--interval", "0.1", "--scale", "0:10:0:100"});
     EXPECT_EQ(outcome.exitCode, 0) << outcome.err;
+    EXPECT_EQ(outcome.err, "Backend: simulated plant\n");
     const std::vector<std::string> lines = Lines(outcome.out);
     ASSERT_EQ(lines.size(), 3u) << outcome.out;
     const std::regex line(
@@ -149,6 +151,55 @@ TEST(TestReadProcess, UsageHelpVersionAndPlantFile) {
         EXPECT_NE(outcome.out.find(c.out), std::string::npos) << outcome.out;
         EXPECT_NE(outcome.err.find(c.err), std::string::npos) << outcome.err;
     }
+}
+
+// The endpoint URL of the node-opcua peer CTest started for test_cli_peer.
+std::string PeerUrl() {
+    const char* file = std::getenv("CV_UA_PEER_URL_FILE");
+    std::ifstream in(file ? file : "");
+    std::string url;
+    std::getline(in, url);
+    return url;
+}
+
+TEST(TestReadPeer, ReadsScaledValuesOfAnOpcUaServer) {
+    const std::string url = PeerUrl();
+    ASSERT_FALSE(url.empty()) << "CV_UA_PEER_URL_FILE names no endpoint URL";
+    struct Case {
+        std::string nodeId;
+        std::string scale;
+        std::string rawAndScaled;
+    };
+    const Case cases[] = {
+        {"ns=1;s=Static.Double", "0:10:0:100", "2.71828182845905\t27.18"},
+        {"ns=1;s=Plant.Area2.Unit1.Pump1.Starts", "0:100:0:1000", "17\t170.00"},
+    };
+    for (const Case& c : cases) {
+        const Outcome outcome =
+            RunProgram({"--test-read", url, "--item", c.nodeId, "--count", "2", "--interval", "0.1",
+                        "--scale", c.scale, "--timeout", "10"});
+        EXPECT_EQ(outcome.exitCode, 0) << outcome.err;
+        EXPECT_EQ(outcome.err, "Backend: OPC UA\n");
+        const std::vector<std::string> lines = Lines(outcome.out);
+        ASSERT_EQ(lines.size(), 2u) << outcome.out;
+        const std::regex line(R"(\d{4}-\d\d-\d\dT\d\d:\d\d:\d\d\.\d{3}\t)" + c.rawAndScaled +
+                              "\tgood");
+        for (const std::string& text : lines) {
+            EXPECT_TRUE(std::regex_match(text, line)) << text;
+        }
+    }
+}
+
+TEST(TestReadPeer, AnUnknownNodeIdIsDiagnosedAndExitsOne) {
+    const Outcome outcome =
+        RunProgram({"--test-read", PeerUrl(), "--item", "ns=1;s=No.Such.Node", "--timeout", "1"});
+    EXPECT_EQ(outcome.exitCode, 1);
+    EXPECT_EQ(outcome.out, "");
+    EXPECT_NE(outcome.err.find("Backend: OPC UA\n"), std::string::npos) << outcome.err;
+    EXPECT_NE(outcome.err.find("Either the Access Path or the Item Name are unknown to the OPC "
+                               "Server."),
+              std::string::npos)
+        << outcome.err;
 }
 
 }  // namespace

@@ -93,10 +93,12 @@ void frmDDETest::CreateControls() {
     grid->addWidget(CreateModeFrame(), 4, 0, 1, 2);
     grid->setColumnStretch(1, 1);
     lblTestResult = NewLabel("lblTestResult", "Test successful");
+    lblBackend = NewLabel("lblBackend");
     mcProgress = new ctlProgress(mTest.Progress());
     auto* layout = new QVBoxLayout(this);
     layout->addWidget(fraTestItem);
     layout->addWidget(lblTestResult);
+    layout->addWidget(lblBackend);
     layout->addWidget(mcProgress);
     layout->addWidget(CreateButtonRow());
     layout->setSizeConstraint(QLayout::SetFixedSize);
@@ -104,6 +106,7 @@ void frmDDETest::CreateControls() {
     lblTimeStampLabel->hide();
     lblTimeStamp->hide();
     lblTestResult->hide();
+    lblBackend->hide();
     setMinimumWidth(fontMetrics().horizontalAdvance(QLatin1Char('x')) * 60);
 }
 
@@ -215,6 +218,8 @@ void frmDDETest::DisplayChanged() {
     ShowModes();
     lblTestResult->setText(Text(shown.testResult));
     lblTestResult->setVisible(shown.showTestResult);
+    lblBackend->setText(Text("Backend: " + shown.backend));
+    lblBackend->setVisible(!shown.backend.empty());
     if (shown.mousePointer != miPointerShown) {
         miPointerShown = shown.mousePointer;
         SetControlsBusy(miPointerShown, *this);

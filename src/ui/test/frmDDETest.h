@@ -83,6 +83,8 @@ class frmDDETest : public QDialog, private ItemTest::Listener {
     QLabel* Label2 = nullptr;
     QPushButton* cmdApply = nullptr;
     QLabel* lblTestResult = nullptr;
+    // Which kind of server answered, once known.
+    QLabel* lblBackend = nullptr;
     ctlProgress* mcProgress = nullptr;
     QPushButton* cmdClose = nullptr;
     QPushButton* cmdHelp = nullptr;

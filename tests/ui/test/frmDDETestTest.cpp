@@ -81,6 +81,7 @@ class frmDDETestTest : public QObject {
         Open(kPlant, "Types.Memory.R8");
         QCOMPARE(window->windowTitle(), QString("Trying to connect..."));
         QVERIFY(!Find<QGroupBox>("fraEngValue")->isVisible());
+        QVERIFY(!Find("lblBackend")->isVisible());
         Advance(100);
         QCOMPARE(window->windowTitle(), QString("Testing Item: Types.Memory.R8"));
         QCOMPARE(Find<QGroupBox>("fraTestItem")->title(),
@@ -91,6 +92,8 @@ class frmDDETestTest : public QObject {
         QCOMPARE(Text("lblEngValue"), QString("50.00"));
         QCOMPARE(Text("lblTimeStamp"), QString("12:00:00 AM  1/1/2025"));
         QCOMPARE(Text("lblInstLabel"), QString("Raw Instrument value :"));
+        QCOMPARE(Text("lblBackend"), QString("Backend: simulated plant"));
+        QVERIFY(Find("lblBackend")->isVisible());
         QVERIFY(Find("lblTimeStampLabel")->isVisible());
         QVERIFY(Find("lblTestResult")->isVisible());
         QVERIFY(Find<QGroupBox>("fraEngValue")->isVisible());

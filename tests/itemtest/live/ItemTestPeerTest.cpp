@@ -1,0 +1,94 @@
+// The item test against the node-opcua peer, on a real event loop: what the
+// test window shows for good, uncertain and bad values, and for a server
+// that shuts down while it reads.
+
+#include <gtest/gtest.h>
+
+#include <algorithm>
+#include <memory>
+#include <string>
+
+#include "channel/Channel.h"
+#include "document/TunFile.h"
+#include "itemtest/ItemTest.h"
+#include "platform/ua/live/LiveUaPlatform.h"
+
+namespace cv::test {
+namespace {
+
+struct ItemTestPeer : LiveUaTest, ItemTest::Listener {
+    void Begin(const std::string& path) {
+        doc.SetDefaults(9);
+        Channel& channel = *doc.Archives().SPChannel();
+        channel.SetOpcNodeAndServer(url);
+        channel.SetItemName("ns=1;s=" + path);
+        channel.SetDescription(path);
+        itemTest = std::make_unique<ItemTest>(lp.platform, doc, channel, *this);
+        itemTest->SetWaitOverride(10'000);
+        itemTest->Start();
+    }
+    bool Said(const std::string& part) const {
+        const auto& shown = lp.dialogs.Messages();
+        return std::any_of(shown.begin(), shown.end(), [&](const auto& m) {
+            return (m.title + "|" + m.text).find(part) != std::string::npos;
+        });
+    }
+
+    void DisplayChanged() override {}
+    void CloseRequested() override { ++closes; }
+    void ValuesShown() override { ++refreshes; }
+
+    TunFile doc{lp.platform};
+    std::unique_ptr<ItemTest> itemTest;
+    int closes = 0;
+    int refreshes = 0;
+};
+
+TEST_F(ItemTestPeer, ValuesOfEachQualityAndTheBackendAreShown) {
+    struct Case {
+        std::string path;
+        bool shown;  // else the test closes with its diagnosis
+        std::string instValue;
+        std::string said;
+    };
+    const Case cases[] = {
+        {"Plant.Area1.FIC101.PV", true, "42.5", ""},
+        {"Quality.Uncertain", true, "12.5", "Quality.Uncertain: Uncertain OPC Value"},
+        {"Quality.Bad_DeviceFailure", false, "", "Device failure"},
+    };
+    for (const Case& c : cases) {
+        lp.dialogs.QueueAnswer(MsgBoxResult::Yes);
+        lp.run.UncertainWarningOff = false;
+        closes = refreshes = 0;
+        Begin(c.path);
+        ASSERT_TRUE(WaitUntil([&] { return refreshes > 0 || closes > 0; })) << c.path;
+        EXPECT_EQ(refreshes > 0, c.shown) << c.path;
+        EXPECT_EQ(itemTest->Display().backend, "OPC UA") << c.path;
+        if (c.shown) {
+            EXPECT_EQ(itemTest->Display().instValue, c.instValue) << c.path;
+        }
+        if (!c.said.empty()) {
+            EXPECT_TRUE(Said(c.said)) << c.path;
+        }
+        itemTest->Unload();
+        itemTest.reset();
+    }
+}
+
+TEST_F(ItemTestPeer, PeerShutdownDuringATestReadEndsIt) {
+    Begin("Dynamic.Counter");
+    ASSERT_TRUE(WaitUntil([&] { return refreshes > 0; }));
+    for (const auto& [path, text] :
+         {std::pair("Control.ShutdownReason", "Maintenance"),
+          std::pair("Control.ShutdownDelay", "300"), std::pair("Control.Shutdown", "1")}) {
+        ErrorInfo error;
+        EXPECT_EQ(client.SendValue(AddChannel(path), text, error), "") << path;
+    }
+    ASSERT_TRUE(WaitUntil([&] { return closes > 0; }));
+    EXPECT_TRUE(itemTest->Closed());
+    EXPECT_TRUE(Said("Error reading Dynamic.Counter"));
+    EXPECT_TRUE(doc.OpcClients().empty());
+}
+
+}  // namespace
+}  // namespace cv::test
