@@ -8,11 +8,14 @@
 #include "platform/Platform.h"
 #include "platform/ServerCallWait.h"
 #include "platform/TraceLog.h"
+#include "platform/opc/RoutingServerFactory.h"
 #include "platform/posix/ConsoleBusyNotice.h"
 #include "platform/posix/ConsoleDialogs.h"
 #include "platform/posix/ConsoleHelp.h"
 #include "platform/posix/ConsoleLocale.h"
 #include "platform/posix/ConsoleModeless.h"
+#include "platform/posix/ConsolePasswordPrompt.h"
+#include "platform/posix/FilePki.h"
 #include "platform/posix/FileProfiles.h"
 #include "platform/posix/FileRegistry.h"
 #include "platform/posix/HostComputerName.h"
@@ -21,6 +24,9 @@
 #include "platform/sim/PlantLoader.h"
 #include "platform/sim/SimDdeServers.h"
 #include "platform/sim/SimulatedPlant.h"
+#include "platform/ua/UaBackend.h"
+#include "security/ThumbprintTrust.h"
+#include "security/UaSecurity.h"
 
 namespace cv {
 
@@ -32,6 +38,21 @@ const char* const kWindowUsage =
     "\n";
 
 namespace {
+
+// The command line's security options as choices for this run.
+security::RunChoices RunChoicesOf(const TestReadOptions& options) {
+    security::RunChoices choices;
+    if (!options.securityMode.empty()) {
+        choices.mode = options.securityMode == "None"   ? ua::MessageSecurityMode::None
+                       : options.securityMode == "Sign" ? ua::MessageSecurityMode::Sign
+                                                        : ua::MessageSecurityMode::SignAndEncrypt;
+    }
+    if (!options.securityPolicy.empty()) {
+        choices.policyUri = "http://opcfoundation.org/UA/SecurityPolicy#" + options.securityPolicy;
+    }
+    choices.userName = options.userName;
+    return choices;
+}
 
 int Run(const TestReadOptions& options, const std::vector<std::string>& arguments) {
     const sim::PlantChoice choice = sim::ChoosePlant(
@@ -53,11 +74,25 @@ int Run(const TestReadOptions& options, const std::vector<std::string>& argument
     platform::ServerCallWait serverCalls(events, busy);
     sim::SimulatedPlant plant(choice.plant, serverCalls,
                               sim::PlantOptions{computer.Query().value_or(""), {}});
+    posix::FilePki pki(posix::FilePki::DefaultRoot());
+    security::ThumbprintTrust trust(options.trustThumbprint);
+    posix::ConsolePasswordPrompt prompt(std::getenv(posix::ConsolePasswordPrompt::kVariable),
+                                        std::cin);
+    uaopc::UaOptions uaOptions;
+    security::UaSecurity security(
+        registry, pki,
+        {uaOptions.session.applicationUri, uaOptions.session.applicationName,
+         computer.Query().value_or("localhost")},
+        &trust, &prompt);
+    security.Settings().SetRunChoices(RunChoicesOf(options));
+    uaOptions.security = &security;
+    uaopc::UaBackend ua(serverCalls, uaOptions);
+    platform::RoutingServerFactory servers(plant, ua);
     platform::TraceLog trace;
     posix::ConsoleModeless modeless(std::cerr);
     Platform platform{
         dialogs,  locale, program, help,        computer, events,          registry,
-        profiles, run,    plant,   serverCalls, trace,    plant.NetEnum(), plant.DdeServers(),
+        profiles, run,    servers, serverCalls, trace,    plant.NetEnum(), plant.DdeServers(),
         modeless};
     return CommandLineTestRead(platform, options, std::cout).Run();
 }
