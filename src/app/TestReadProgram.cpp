@@ -14,6 +14,8 @@
 #include "platform/posix/ConsoleHelp.h"
 #include "platform/posix/ConsoleLocale.h"
 #include "platform/posix/ConsoleModeless.h"
+#include "platform/posix/ConsolePasswordPrompt.h"
+#include "platform/posix/FilePki.h"
 #include "platform/posix/FileProfiles.h"
 #include "platform/posix/FileRegistry.h"
 #include "platform/posix/HostComputerName.h"
@@ -23,6 +25,8 @@
 #include "platform/sim/SimDdeServers.h"
 #include "platform/sim/SimulatedPlant.h"
 #include "platform/ua/UaBackend.h"
+#include "security/ThumbprintTrust.h"
+#include "security/UaSecurity.h"
 
 namespace cv {
 
@@ -34,6 +38,21 @@ const char* const kWindowUsage =
     "\n";
 
 namespace {
+
+// The command line's security options as choices for this run.
+security::RunChoices RunChoicesOf(const TestReadOptions& options) {
+    security::RunChoices choices;
+    if (!options.securityMode.empty()) {
+        choices.mode = options.securityMode == "None"   ? ua::MessageSecurityMode::None
+                       : options.securityMode == "Sign" ? ua::MessageSecurityMode::Sign
+                                                        : ua::MessageSecurityMode::SignAndEncrypt;
+    }
+    if (!options.securityPolicy.empty()) {
+        choices.policyUri = "http://opcfoundation.org/UA/SecurityPolicy#" + options.securityPolicy;
+    }
+    choices.userName = options.userName;
+    return choices;
+}
 
 int Run(const TestReadOptions& options, const std::vector<std::string>& arguments) {
     const sim::PlantChoice choice = sim::ChoosePlant(
@@ -55,8 +74,19 @@ int Run(const TestReadOptions& options, const std::vector<std::string>& argument
     platform::ServerCallWait serverCalls(events, busy);
     sim::SimulatedPlant plant(choice.plant, serverCalls,
                               sim::PlantOptions{computer.Query().value_or(""), {}});
-    // Endpoint URLs go to OPC UA servers, every other server ID to the plant.
-    uaopc::UaBackend ua(serverCalls);
+    posix::FilePki pki(posix::FilePki::DefaultRoot());
+    security::ThumbprintTrust trust(options.trustThumbprint);
+    posix::ConsolePasswordPrompt prompt(std::getenv(posix::ConsolePasswordPrompt::kVariable),
+                                        std::cin);
+    uaopc::UaOptions uaOptions;
+    security::UaSecurity security(
+        registry, pki,
+        {uaOptions.session.applicationUri, uaOptions.session.applicationName,
+         computer.Query().value_or("localhost")},
+        &trust, &prompt);
+    security.Settings().SetRunChoices(RunChoicesOf(options));
+    uaOptions.security = &security;
+    uaopc::UaBackend ua(serverCalls, uaOptions);
     platform::RoutingServerFactory servers(plant, ua);
     platform::TraceLog trace;
     posix::ConsoleModeless modeless(std::cerr);

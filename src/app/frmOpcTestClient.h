@@ -24,6 +24,10 @@ struct Platform;
 // scaling ranges and the sample interval, and starts the test read. Each
 // field is checked and written through to the channel or the document's
 // general settings when the focus leaves it for another control.
+namespace security {
+class ServerSettings;
+}
+
 class frmOpcTestClient : public QWidget {
     Q_OBJECT
 
@@ -33,6 +37,10 @@ class frmOpcTestClient : public QWidget {
     TunFile& Document() { return mcTunFile; }
     // The channel under test: the document's SP channel.
     Channel& TestChannel() { return *mcChannel; }
+    // Adds a small "Security..." button beside the server box that opens the
+    // OPC UA security choices of the endpoint URL in it. Without this call the
+    // window has no such button.
+    void OfferServerSecurity(security::ServerSettings& settings);
 
   protected:
     bool eventFilter(QObject* watched, QEvent* event) override;
@@ -55,6 +63,7 @@ class frmOpcTestClient : public QWidget {
     void cmdTest_Click();
     void cmdHelp_Click();
     void cmdClose_Click();
+    void cmdServerSecurity_Click();
 
     // Field checks (frmOpcTestClient_validate.cpp).
     void QueueValidation(QWidget* field);
@@ -89,6 +98,8 @@ class frmOpcTestClient : public QWidget {
     QLabel* Label1 = nullptr;
     QLineEdit* txtServerID = nullptr;
     QPushButton* cmdBrowseServers = nullptr;
+    QPushButton* cmdServerSecurity = nullptr;
+    security::ServerSettings* mServerSettings = nullptr;
     QLabel* Label2 = nullptr;
     QLineEdit* txtAccessPath = nullptr;
     QLabel* Label3 = nullptr;

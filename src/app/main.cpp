@@ -33,19 +33,23 @@
 #include "platform/ServerCallWait.h"
 #include "platform/TraceLog.h"
 #include "platform/opc/RoutingServerFactory.h"
+#include "platform/posix/FilePki.h"
 #include "platform/posix/FileProfiles.h"
 #include "platform/posix/FileRegistry.h"
 #include "platform/posix/HostComputerName.h"
 #include "platform/posix/PosixProgramInfo.h"
 #include "platform/qt/HelpWindow.h"
+#include "platform/qt/PasswordDialog.h"
 #include "platform/qt/QtBusyNotice.h"
 #include "platform/qt/QtDialogs.h"
 #include "platform/qt/QtEventLoop.h"
 #include "platform/qt/QtLocale.h"
+#include "platform/qt/TrustDialog.h"
 #include "platform/sim/PlantLoader.h"
 #include "platform/sim/SimDdeServers.h"
 #include "platform/sim/SimulatedPlant.h"
 #include "platform/ua/UaBackend.h"
+#include "security/UaSecurity.h"
 #include "stores/RegClass.h"
 #include "ui/widgets/ModelessMessageForms.h"
 #include "util/ProgramRoutines.h"
@@ -139,6 +143,15 @@ int main(int argc, char** argv) {
                                   cv::sim::PlantOptions{computer.Query().value_or(""), {}});
     cv::uaopc::UaOptions uaOptions;
     uaOptions.discoveryPort = DiscoveryPort(registry);
+    cv::posix::FilePki pki(cv::posix::FilePki::DefaultRoot());
+    cv::qtui::QtCertificateTrust trustQuestion;
+    cv::qtui::QtPasswordPrompt passwordPrompt;
+    cv::security::UaSecurity security(
+        registry, pki,
+        {uaOptions.session.applicationUri, uaOptions.session.applicationName,
+         computer.Query().value_or("localhost")},
+        &trustQuestion, &passwordPrompt);
+    uaOptions.security = &security;
     cv::uaopc::UaBackend ua(serverCalls, uaOptions);
     cv::platform::RoutingServerFactory servers(plant, ua);
     cv::platform::TraceLog trace;
@@ -154,6 +167,7 @@ int main(int argc, char** argv) {
 
     QuitWhenPainted quitter;
     cv::frmOpcTestClient window(platform);
+    window.OfferServerSecurity(security.Settings());
     if (quitWhenShown) {
         window.installEventFilter(&quitter);
     }

@@ -1,5 +1,6 @@
 #include "itemtest/TestReadCommandLine.h"
 
+#include <cctype>
 #include <charconv>
 #include <cmath>
 #include <functional>
@@ -46,6 +47,34 @@ std::optional<TestReadScale> Scale(const std::string& text) {
 // 0.05 apart.
 bool RangeOk(double dMin, double dMax) {
     return dMin <= dMax && dMax - dMin >= 0.05;
+}
+
+std::string Choice(const char* option, const std::string& value,
+                   const std::vector<std::string>& choices, std::string& field) {
+    for (const std::string& choice : choices) {
+        if (choice == value) {
+            field = value;
+            return {};
+        }
+    }
+    std::string names;
+    for (const std::string& choice : choices) {
+        names += (names.empty() ? "" : ", ") + choice;
+    }
+    return std::string(option) + " must be one of " + names + ", not \"" + value + "\"";
+}
+
+// A SHA-1 thumbprint in hexadecimal, with or without colons, in upper case.
+std::optional<std::string> Thumbprint(const std::string& text) {
+    std::string digits;
+    for (const char c : text) {
+        if (std::isxdigit(static_cast<unsigned char>(c))) {
+            digits += static_cast<char>(std::toupper(static_cast<unsigned char>(c)));
+        } else if (c != ':') {
+            return std::nullopt;
+        }
+    }
+    return digits.size() == 40 ? std::optional(digits) : std::nullopt;
 }
 
 using Setter = std::function<std::string(TestReadOptions&, const std::string&)>;
@@ -111,6 +140,30 @@ const std::map<std::string, Setter>& Setters() {
              o.plantFile = v;
              return v.empty() ? std::string("--plant needs a file") : "";
          }},
+        {"--security-mode",
+         [](TestReadOptions& o, const std::string& v) {
+             return Choice("--security-mode", v, {"None", "Sign", "SignAndEncrypt"},
+                           o.securityMode);
+         }},
+        {"--security-policy",
+         [](TestReadOptions& o, const std::string& v) {
+             return Choice("--security-policy", v, {"Basic256Sha256", "Aes128_Sha256_RsaOaep"},
+                           o.securityPolicy);
+         }},
+        {"--user",
+         [](TestReadOptions& o, const std::string& v) {
+             o.userName = v;
+             return v.empty() ? std::string("--user needs a user name") : "";
+         }},
+        {"--trust",
+         [](TestReadOptions& o, const std::string& v) {
+             const auto thumbprint = Thumbprint(v);
+             o.trustThumbprint = thumbprint.value_or("");
+             return thumbprint ? std::string()
+                               : "--trust must be a certificate thumbprint of 40 hexadecimal "
+                                 "digits, not \"" +
+                                     v + "\"";
+         }},
     };
     return setters;
 }
@@ -168,6 +221,9 @@ TestReadCommand ParseTestReadCommand(const std::vector<std::string>& arguments) 
     if (command.options.nodeAndServer.empty() || command.options.itemId.empty()) {
         return Usage("--test-read and --item are both needed");
     }
+    if (command.options.securityMode == "None" && !command.options.securityPolicy.empty()) {
+        return Usage("--security-policy needs --security-mode Sign or SignAndEncrypt");
+    }
     return command;
 }
 
@@ -175,9 +231,10 @@ std::string TestReadUsage() {
     return "usage: cvopctestclient --test-read '\\\\Node\\Server' --item ID [options]\n"
            "       cvopctestclient --help | --version\n"
            "\n"
-           "Reads one OPC item without a window and prints one line per value: time\n"
-           "stamp, raw value, scaled value and quality. Standard error first says which\n"
-           "kind of server answered: \"Backend: OPC UA\" or \"Backend: simulated plant\".\n"
+           "Reads one OPC item on the simulated plant or an OPC UA server without a\n"
+           "window and prints one line per value: time stamp, raw value, scaled value\n"
+           "and quality. Standard error first says which kind of server answered:\n"
+           "\"Backend: OPC UA\" or \"Backend: simulated plant\".\n"
            "\n"
            "  --test-read SERVER   the OPC server: an OPC UA endpoint URL\n"
            "                       (opc.tcp://host:port/path), \\\\Node\\Server or a\n"
@@ -191,6 +248,18 @@ std::string TestReadUsage() {
            "  --timeout S          wait for the server and the first value (default:\n"
            "                       the wait remembered by the test window, 10 s at first)\n"
            "  --plant FILE         simulate the plant FILE describes\n"
+           "\n"
+           "OPC UA servers (opc.tcp://host:port/path) are reached as chosen for them in\n"
+           "the window (at first the most secure way they offer), unless told here:\n"
+           "  --security-mode M    None, Sign or SignAndEncrypt\n"
+           "  --security-policy P  Basic256Sha256 or Aes128_Sha256_RsaOaep\n"
+           "  --user NAME          log on as NAME; the password is read from the\n"
+           "                       environment variable CVOPCTESTCLIENT_PASSWORD, or\n"
+           "                       else from standard input (it is never stored)\n"
+           "  --trust THUMBPRINT   trust the server certificate with this SHA-1\n"
+           "                       thumbprint for this run; any other certificate that\n"
+           "                       is not trusted already is refused, and the reason and\n"
+           "                       its thumbprint are printed\n"
            "\n"
            "Numbers are written with a point. Exit status: 0 every value was read,\n"
            "1 the test failed (the reason is printed), 2 the command line is wrong,\n"

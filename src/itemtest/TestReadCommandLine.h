@@ -31,6 +31,16 @@ struct TestReadOptions {
     // Overrides the remembered wait for this run only.
     std::optional<double> timeoutSec;
     std::string plantFile;
+    // OPC UA security for this run; empty: as chosen for the server in the
+    // window (by default the most secure it offers). The mode is "None",
+    // "Sign" or "SignAndEncrypt", the policy "Basic256Sha256" or
+    // "Aes128_Sha256_RsaOaep". A user name's password comes from the
+    // environment or standard input, never from the command line.
+    std::string securityMode;
+    std::string securityPolicy;
+    std::string userName;
+    // The one unknown server certificate to trust: 40 upper-case hex digits.
+    std::string trustThumbprint;
 };
 
 // Exit codes of the command-line test read.

@@ -62,6 +62,14 @@ ServerSecurity ServerSettings::Read(const std::string& endpointUrl) {
     security.policyUri = registry.ReadString(key, "SecurityPolicy", "");
     security.identity = FromText(kIdentities, registry.ReadString(key, "Identity", "Anonymous"));
     security.userName = registry.ReadString(key, "UserName", "");
+    if (run_.mode) {
+        security.mode = *run_.mode;
+        security.policyUri = run_.policyUri;
+    }
+    if (!run_.userName.empty()) {
+        security.identity = ua::UserTokenType::UserName;
+        security.userName = run_.userName;
+    }
     return security;
 }
 

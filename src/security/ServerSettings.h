@@ -1,5 +1,6 @@
 #pragma once
 
+#include <optional>
 #include <string>
 
 #include "platform/RegistryApi.h"
@@ -20,6 +21,15 @@ struct ServerSecurity {
     bool operator==(const ServerSecurity&) const = default;
 };
 
+// Choices for one run ahead of the registry's, for every server (the
+// command line's options). A mode set here brings its policy (empty: the
+// best for the mode); a user name logs on with it.
+struct RunChoices {
+    std::optional<ua::MessageSecurityMode> mode;
+    std::string policyUri;
+    std::string userName;
+};
+
 // The security choices per server (endpoint URL) in the user's registry:
 // HKEY_CURRENT_USER\Software\Corvalent\TestClient\UaServers\<URL>, values
 // "SecurityMode" ("Best", "None", "Sign", "SignAndEncrypt"),
@@ -32,12 +42,16 @@ class ServerSettings {
 
     ServerSecurity Read(const std::string& endpointUrl);
     void Write(const std::string& endpointUrl, const ServerSecurity& security);
+    // Read gives these ahead of the registry's until the program ends;
+    // nothing is written.
+    void SetRunChoices(RunChoices choices) { run_ = std::move(choices); }
 
     // The key of a URL: "\" and "%" become %5C and %25.
     static std::string KeyOf(const std::string& endpointUrl);
 
   private:
     platform::RegistryApi& registry_;
+    RunChoices run_;
 };
 
 }  // namespace cv::security

@@ -82,6 +82,79 @@ TEST(TestReadCommandLine, RefusesWhatCannotBeRead) {
     }
 }
 
+TEST(TestReadCommandLine, TakesSecurityChoicesAndRefusesOthers) {
+    struct Case {
+        Args extra;
+        std::string error;  // empty: accepted
+        std::string mode, policy, user, thumbprint;
+    };
+    const std::string upper = "0123456789ABCDEF0123456789ABCDEF01234567";
+    const Case cases[] = {
+        {{}, "", "", "", "", ""},
+        {{"--security-mode", "SignAndEncrypt", "--security-policy=Aes128_Sha256_RsaOaep"},
+         "",
+         "SignAndEncrypt",
+         "Aes128_Sha256_RsaOaep",
+         "",
+         ""},
+        {{"--security-mode=Sign", "--user", "bob"}, "", "Sign", "", "bob", ""},
+        {{"--trust", "01:23:45:67:89:ab:cd:ef:01:23:45:67:89:ab:cd:ef:01:23:45:67"},
+         "",
+         "",
+         "",
+         "",
+         upper},
+        {{"--security-mode", "Encrypt"},
+         "--security-mode must be one of None, Sign, SignAndEncrypt, not \"Encrypt\"",
+         "",
+         "",
+         "",
+         ""},
+        {{"--security-policy", "Basic128Rsa15"},
+         "--security-policy must be one of Basic256Sha256, Aes128_Sha256_RsaOaep, not "
+         "\"Basic128Rsa15\"",
+         "",
+         "",
+         "",
+         ""},
+        {{"--security-mode", "None", "--security-policy", "Basic256Sha256"},
+         "--security-policy needs --security-mode Sign or SignAndEncrypt",
+         "",
+         "",
+         "",
+         ""},
+        {{"--user", ""}, "--user needs a user name", "", "", "", ""},
+        {{"--user"}, "--user needs a value", "", "", "", ""},
+        {{"--trust", upper + "00"},
+         "--trust must be a certificate thumbprint of 40 hexadecimal digits, not \"" + upper +
+             "00\"",
+         "",
+         "",
+         "",
+         ""},
+        {{"--trust", "XYZ"},
+         "--trust must be a certificate thumbprint of 40 hexadecimal digits, not \"XYZ\"",
+         "",
+         "",
+         "",
+         ""},
+    };
+    for (const Case& c : cases) {
+        const TestReadCommand command = ParseTestReadCommand(With(c.extra));
+        SCOPED_TRACE(c.error);
+        if (!c.error.empty()) {
+            EXPECT_EQ(command.action, Action::Usage);
+            EXPECT_EQ(command.error, c.error);
+            continue;
+        }
+        ASSERT_EQ(command.action, Action::Run) << command.error;
+        EXPECT_EQ(command.options.securityMode, c.mode);
+        EXPECT_EQ(command.options.securityPolicy, c.policy);
+        EXPECT_EQ(command.options.userName, c.user);
+        EXPECT_EQ(command.options.trustThumbprint, c.thumbprint);
+    }
+}
+
 TEST(TestReadCommandLine, HelpAndVersionWinAndTellTheWindowFromTheTerminal) {
     EXPECT_EQ(ParseTestReadCommand(With({"--help", "--bogus"})).action, Action::Help);
     EXPECT_EQ(ParseTestReadCommand({"-h"}).action, Action::Help);

@@ -68,6 +68,32 @@ TEST_F(ServerSettingsTest, ReadsUnknownWordsAsTheDefaults) {
     EXPECT_EQ(read.userName, "operator");
 }
 
+TEST_F(ServerSettingsTest, RunChoicesGoAheadOfTheRegistryWithoutBeingWritten) {
+    const std::string url = "opc.tcp://plant:4840";
+    const ServerSecurity stored{MessageSecurityMode::Sign, kBasic, UserTokenType::UserName, "ann"};
+    struct Row {
+        RunChoices run;
+        ServerSecurity read;
+    };
+    const std::vector<Row> rows = {
+        {{}, stored},
+        {{MessageSecurityMode::SignAndEncrypt, "", ""},
+         {MessageSecurityMode::SignAndEncrypt, "", UserTokenType::UserName, "ann"}},
+        {{MessageSecurityMode::None, "", "bob"},
+         {MessageSecurityMode::None, "", UserTokenType::UserName, "bob"}},
+        {{std::nullopt, "", "bob"},
+         {MessageSecurityMode::Sign, kBasic, UserTokenType::UserName, "bob"}},
+    };
+    ServerSettings(registry_).Write(url, stored);
+    const std::string before = RegistryText();
+    for (const Row& row : rows) {
+        ServerSettings settings(registry_);
+        settings.SetRunChoices(row.run);
+        EXPECT_EQ(settings.Read(url), row.read);
+    }
+    EXPECT_EQ(RegistryText(), before);
+}
+
 TEST(RunPasswords, KeepsAPasswordPerServerAndUserUntilForgotten) {
     RunPasswords passwords;
     passwords.Remember("opc.tcp://a", "bob", "one");

@@ -6,6 +6,8 @@
 #include "platform/opc/OpcResult.h"
 #include "platform/ua/UaGroupState.h"
 #include "platform/ua/UaStatusMap.h"
+#include "security/SecureConnect.h"
+#include "security/UaSecurity.h"
 #include "ua/types/StatusCodeTable.h"
 
 namespace cv::uaopc {
@@ -36,11 +38,22 @@ ErrorInfo UaConnection::Connect(const std::string& address, const std::string& n
         });
     const auto self = shared_from_this();
     ua::Client& client = *client_;
+    std::optional<security::SecureConnect> secure;
+    if (security::UaSecurity* run = runtime_->Options().security) {
+        secure.emplace(client, run->Services());
+    }
     std::optional<ua::Result<ua::SessionInfo>> opened;
     const ErrorInfo waited = Await<ua::SessionInfo>(
         runtime_->CallWait(),
         [self, session] { return self->released_ || self->session_ != session; },
-        [&](auto done) { client.Connect(address, std::move(done)); }, opened);
+        [&](auto done) {
+            if (secure) {
+                secure->Connect(address, std::move(done));
+            } else {
+                client.Connect(address, std::move(done));
+            }
+        },
+        opened);
     if (waited) {
         if (!released_ && session_ == session) {
             client_.reset();

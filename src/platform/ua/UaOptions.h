@@ -5,6 +5,10 @@
 
 #include "ua/client/ClientOptions.h"
 
+namespace cv::security {
+class UaSecurity;
+}
+
 namespace cv::uaopc {
 
 // The environment variable that sets the discovery port (a number from 1 to
@@ -32,6 +36,10 @@ struct UaOptions {
     uint32_t browseBatch = 1'000;
     // A subscription sends a keep-alive after this long without changes.
     uint32_t keepAliveMs = 10'000;
+    // The run's security: each server is connected as the user chose for it
+    // (by default the most secure way it offers). Null: plain connections
+    // without security. Must outlive the backend's objects.
+    security::UaSecurity* security = nullptr;
 };
 
 // A port number from its text ("4841"); nothing for anything else.
