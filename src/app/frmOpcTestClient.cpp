@@ -105,6 +105,9 @@ QGroupBox* frmOpcTestClient::CreateAddressFrame() {
     grid->addWidget(txtItemID, 2, 1);
     grid->addWidget(cmdBrowseItems, 2, 2);
     grid->addWidget(cmdTest, 3, 2);
+    lblBackend = Named(new QLabel, "lblBackend");
+    grid->addWidget(lblBackend, 3, 1);
+    connect(txtServerID, &QLineEdit::textChanged, this, [this] { ShowBackend(); });
     grid->setColumnStretch(1, 1);
     return Frame1;
 }

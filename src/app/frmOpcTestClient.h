@@ -64,6 +64,8 @@ class frmOpcTestClient : public QWidget {
     void cmdHelp_Click();
     void cmdClose_Click();
     void cmdServerSecurity_Click();
+    // Says which backend a test read of the server in the box will use.
+    void ShowBackend();
 
     // Field checks (frmOpcTestClient_validate.cpp).
     void QueueValidation(QWidget* field);
@@ -99,6 +101,7 @@ class frmOpcTestClient : public QWidget {
     QLineEdit* txtServerID = nullptr;
     QPushButton* cmdBrowseServers = nullptr;
     QPushButton* cmdServerSecurity = nullptr;
+    QLabel* lblBackend = nullptr;
     security::ServerSettings* mServerSettings = nullptr;
     QLabel* Label2 = nullptr;
     QLineEdit* txtAccessPath = nullptr;

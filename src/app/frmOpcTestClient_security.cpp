@@ -1,5 +1,6 @@
 #include <QGridLayout>
 #include <QGroupBox>
+#include <QLabel>
 #include <QLineEdit>
 #include <QPushButton>
 
@@ -34,6 +35,19 @@ void frmOpcTestClient::cmdServerSecurity_Click() {
     }
     ServerSecurityDialog dialog(*mServerSettings, url, this);
     dialog.exec();
+}
+
+// The router sends endpoint URLs to OPC UA and every other server ID to the
+// simulated plant; the label says so before the user presses "Test read".
+void frmOpcTestClient::ShowBackend() {
+    const std::string id = txtServerID->text().trimmed().toStdString();
+    if (id.empty()) {
+        lblBackend->clear();
+        return;
+    }
+    lblBackend->setText(uaopc::UaBackend::IsEndpointUrl(id)
+                            ? QStringLiteral("Backend: OPC UA")
+                            : QStringLiteral("Backend: simulated plant"));
 }
 
 }  // namespace cv

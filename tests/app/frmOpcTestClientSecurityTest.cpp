@@ -1,6 +1,7 @@
 #include <QComboBox>
 #include <QDialog>
 #include <QDialogButtonBox>
+#include <QLabel>
 #include <QLineEdit>
 #include <QPushButton>
 #include <QTimer>
@@ -68,6 +69,21 @@ class frmOpcTestClientSecurityTest : public QObject {
         window->OfferServerSecurity(*settings);
         window->show();
     }
+    void theBoxSaysWhichBackendATestReadUses() {
+        const std::pair<QString, QString> cases[] = {
+            {"", ""},
+            {"Sim.Plant.1", "Backend: simulated plant"},
+            {"\\\\OPCHOST1\\Sim.Plant.1", "Backend: simulated plant"},
+            {QString::fromStdString(kUrl), "Backend: OPC UA"},
+            {" opc.tcp://127.0.0.1:4841/UA ", "Backend: OPC UA"},
+        };
+        auto* box = window->findChild<QLineEdit*>("txtServerID");
+        for (const auto& [server, shown] : cases) {
+            box->setText(server);
+            QCOMPARE(window->findChild<QLabel*>("lblBackend")->text(), shown);
+        }
+    }
+
     void cleanup() {
         window.reset();
         settings.reset();
