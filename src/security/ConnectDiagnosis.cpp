@@ -45,6 +45,37 @@ std::string DescribeUserRefusal(const std::string& endpointUrl, const std::strin
                   "2. Check that this user may log on to the server."});
 }
 
+std::string DescribeUnsecuredServer(const std::string& endpointUrl, const std::string& userName) {
+    return Lines(
+        {"The program did not send the password of " + Quoted(userName) + " to " +
+             Quoted(endpointUrl) + ": the server offers only connections without security, " +
+             "so nothing proves that the computer answering is the server.",
+         "",
+         "1. Ask the server's administrator to offer a secured endpoint (Sign or "
+         "SignAndEncrypt).",
+         "2. On a network you trust, you may choose the security mode None for this server on "
+         "purpose (Security... beside the server, or --security-mode None); the password is "
+         "then encrypted to a server certificate you trust, and never sent in clear text."});
+}
+
+std::string DescribeClearPassword(const std::string& endpointUrl, const std::string& userName) {
+    return Lines({"The program did not send the password of " + Quoted(userName) + " to " +
+                      Quoted(endpointUrl) +
+                      ": this endpoint would take it in clear text, readable on the network.",
+                  "",
+                  "1. Choose the security mode SignAndEncrypt for this server, or ask its "
+                  "administrator to encrypt passwords (a user token security policy)."});
+}
+
+std::string DescribeDoubtfulServer(const std::string& endpointUrl, const std::string& reason) {
+    return Lines({"The program stopped connecting to " + Quoted(endpointUrl) +
+                      ": the server answering is not the one whose certificate was checked. " +
+                      reason,
+                  "", "1. No password and no value was taken from it.",
+                  "2. Check that the address leads to the server itself, and that no other "
+                  "computer answers in its place."});
+}
+
 std::string DescribeNoUserName(const std::string& endpointUrl) {
     return Lines({"No user name is set for the server at " + Quoted(endpointUrl) + ".", "",
                   "1. Enter a user name for this server, or log on anonymously."});

@@ -18,6 +18,13 @@ std::string DescribeSecurityRefusal(const std::string& endpointUrl, const std::s
                                     const std::string& thumbprint);
 std::string DescribeUserRefusal(const std::string& endpointUrl, const std::string& userName,
                                 const std::string& reason);
+// The most secure choice found only endpoints without security, so a
+// password would go to a server nobody can check.
+std::string DescribeUnsecuredServer(const std::string& endpointUrl, const std::string& userName);
+// The endpoint would take the password in clear text.
+std::string DescribeClearPassword(const std::string& endpointUrl, const std::string& userName);
+// The server answering is not the one whose certificate was checked.
+std::string DescribeDoubtfulServer(const std::string& endpointUrl, const std::string& reason);
 std::string DescribeNoUserName(const std::string& endpointUrl);
 std::string DescribeNoPassword(const std::string& endpointUrl, const std::string& userName);
 std::string DescribeOwnCertificateFailure(const std::string& reason, const std::string& folder);

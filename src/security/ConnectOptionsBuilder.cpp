@@ -6,6 +6,7 @@
 #include "security/ConnectDiagnosis.h"
 #include "security/TrustDiagnosis.h"
 #include "ua/client/EndpointChoice.h"
+#include "ua/client/IdentityToken.h"
 
 namespace cv::security {
 namespace {
@@ -34,13 +35,18 @@ bool Askable(const platform::TrustQuestion& question) {
     });
 }
 
+// How a server refuses a client whose certificate it does not accept.
 bool IsSecurityRefusal(ua::StatusCode status) {
     return status == ua::status::BadSecurityChecksFailed ||
            status == ua::status::BadCertificateUntrusted ||
-           status == ua::status::BadCertificateInvalid ||
-           status == ua::status::BadCertificateUriInvalid ||
            status == ua::status::BadCertificateTimeInvalid ||
            status == ua::status::BadCertificateUseNotAllowed;
+}
+
+// How the client finds that the server answering is not the one checked.
+bool IsDoubtfulServer(ua::StatusCode status) {
+    return status == ua::status::BadCertificateInvalid ||
+           status == ua::status::BadCertificateUriInvalid || status == ua::status::BadNonceInvalid;
 }
 
 // Anonymous without security: the client connects as it always did.
@@ -68,6 +74,9 @@ ua::Result<ua::ConnectOptions> ConnectOptionsBuilder::Build(
     if (IsPlain(security)) {
         return ua::ConnectOptions{};
     }
+    if (security.identity == ua::UserTokenType::UserName && security.userName.empty()) {
+        return ua::Error{ua::status::BadIdentityTokenInvalid, DescribeNoUserName(endpointUrl)};
+    }
     auto endpoint =
         ua::ChooseEndpoint(endpoints, {security.mode, security.policyUri, security.identity});
     if (!endpoint) {
@@ -76,11 +85,11 @@ ua::Result<ua::ConnectOptions> ConnectOptionsBuilder::Build(
     }
     ua::ConnectOptions connect;
     connect.endpoint = endpoint.Value();
+    auto guarded = GuardPassword(endpointUrl, security, *connect.endpoint);
+    if (!guarded) {
+        return guarded.Failure();
+    }
     if (connect.endpoint->securityMode != ua::MessageSecurityMode::None) {
-        auto approved = Approve(endpointUrl, *connect.endpoint);
-        if (!approved) {
-            return approved.Failure();
-        }
         auto own = services_.own.Get();
         if (!own) {
             return ua::Error{
@@ -95,6 +104,28 @@ ua::Result<ua::ConnectOptions> ConnectOptionsBuilder::Build(
     }
     connect.identity = std::move(identity.Value());
     return connect;
+}
+
+// The server's certificate is checked before anything secret is made for
+// it: the channel's keys on a secured endpoint, or a password encrypted to
+// it on any endpoint. A password never goes to a server that shows no
+// security unless the user chose that for it, and never in clear text.
+ua::Result<ua::Done> ConnectOptionsBuilder::GuardPassword(const std::string& endpointUrl,
+                                                          const ServerSecurity& security,
+                                                          const ua::EndpointDescription& endpoint) {
+    const bool secured = endpoint.securityMode != ua::MessageSecurityMode::None;
+    if (security.identity != ua::UserTokenType::UserName) {
+        return secured ? Approve(endpointUrl, endpoint) : ua::Result<ua::Done>(ua::Done{});
+    }
+    if (!secured && security.mode == ua::MessageSecurityMode::Invalid) {
+        return ua::Error{ua::status::BadSecurityModeRejected,
+                         DescribeUnsecuredServer(endpointUrl, security.userName)};
+    }
+    if (ua::RouteOfPassword(endpoint) == ua::PasswordRoute::Refused) {
+        return ua::Error{ua::status::BadIdentityTokenInvalid,
+                         DescribeClearPassword(endpointUrl, security.userName)};
+    }
+    return Approve(endpointUrl, endpoint);
 }
 
 ua::Result<ua::Done> ConnectOptionsBuilder::Approve(const std::string& endpointUrl,
@@ -138,9 +169,6 @@ ua::Result<ua::UserIdentity> ConnectOptionsBuilder::Identity(const std::string& 
         return ua::UserIdentity{};
     }
     const std::string& user = security.userName;
-    if (user.empty()) {
-        return ua::Error{ua::status::BadIdentityTokenInvalid, DescribeNoUserName(endpointUrl)};
-    }
     auto password = services_.passwords.Find(endpointUrl, user);
     if (!password && services_.prompt) {
         password = services_.prompt->AskPassword(
@@ -171,6 +199,9 @@ ua::Result<ua::SessionInfo> ConnectOptionsBuilder::Settle(const std::string& end
         refused_.insert({endpointUrl, identity.userName});
         return ua::Error{failure.status,
                          DescribeUserRefusal(endpointUrl, identity.userName, failure.text)};
+    }
+    if (connect.endpoint && IsDoubtfulServer(failure.status)) {
+        return ua::Error{failure.status, DescribeDoubtfulServer(endpointUrl, failure.text)};
     }
     if (connect.credentials && IsSecurityRefusal(failure.status)) {
         return ua::Error{

@@ -53,6 +53,9 @@ class ConnectOptionsBuilder {
                                        ua::Result<ua::SessionInfo> session);
 
   private:
+    ua::Result<ua::Done> GuardPassword(const std::string& endpointUrl,
+                                       const ServerSecurity& security,
+                                       const ua::EndpointDescription& endpoint);
     ua::Result<ua::Done> Approve(const std::string& endpointUrl,
                                  const ua::EndpointDescription& endpoint);
     ua::Result<ua::UserIdentity> Identity(const std::string& endpointUrl,

@@ -46,9 +46,9 @@ class ConnectOptionsBuilderTest : public ::testing::Test {
     }
 
     ua::Result<ua::ConnectOptions> Build() { return builder_.Build(kUrl, endpoints_); }
-    void ChooseUser(const std::string& user) {
-        security_.Settings().Write(kUrl,
-                                   {MessageSecurityMode::None, "", UserTokenType::UserName, user});
+    void ChooseUser(const std::string& user,
+                    MessageSecurityMode mode = MessageSecurityMode::Invalid) {
+        security_.Settings().Write(kUrl, {mode, "", UserTokenType::UserName, user});
     }
     size_t FilesIn(const char* folder) const {
         std::error_code ec;
@@ -132,6 +132,7 @@ TEST_F(ConnectOptionsBuilderTest, WithNobodyToAskAnUnknownCertificateIsRefusedWi
 }
 
 TEST_F(ConnectOptionsBuilderTest, APasswordIsAskedForKeptWhenItWorksAndForgottenWhenRefused) {
+    question_.answer = TrustAnswer::TrustForSession;
     ChooseUser("bob");
     prompt_.answers = {"wrong", "secret"};
     auto first = Build();
@@ -155,6 +156,7 @@ TEST_F(ConnectOptionsBuilderTest, APasswordIsAskedForKeptWhenItWorksAndForgotten
 }
 
 TEST_F(ConnectOptionsBuilderTest, AMissingUserNameOrPasswordStopsBeforeConnecting) {
+    question_.answer = TrustAnswer::TrustForSession;
     ChooseUser("");
     auto unnamed = Build();
     ASSERT_FALSE(unnamed);
@@ -163,6 +165,67 @@ TEST_F(ConnectOptionsBuilderTest, AMissingUserNameOrPasswordStopsBeforeConnectin
     auto cancelled = Build();
     ASSERT_FALSE(cancelled);
     EXPECT_EQ(cancelled.Failure().status, ua::status::BadRequestCancelledByClient);
+}
+
+// A server that shows no security, or a certificate nobody checked, never
+// gets a password: it is not even asked for.
+TEST_F(ConnectOptionsBuilderTest, APasswordGoesOnlyToACheckedCertificateAndNeverInClear) {
+    const std::string der(server_.certificate.LeafDer());
+    const auto encrypting = [&](std::string certificate) {
+        auto endpoint = Endpoint(MessageSecurityMode::None,
+                                 "http://opcfoundation.org/UA/SecurityPolicy#None", certificate);
+        endpoint.userIdentityTokens = {{"rsa", UserTokenType::UserName, "", "", kBasic256Sha256}};
+        return endpoint;
+    };
+    struct Case {
+        const char* name;
+        MessageSecurityMode chosen;
+        ua::EndpointDescription offered;
+        TrustAnswer answer;
+        ua::StatusCode refusal;  // Good: connects with the password
+        size_t questions;
+    };
+    const Case cases[] = {
+        {"the most secure choice, a server offering None only", MessageSecurityMode::Invalid,
+         encrypting(der), TrustAnswer::TrustAlways, ua::status::BadSecurityModeRejected, 0},
+        {"None on purpose, clear text only", MessageSecurityMode::None, endpoints_[0],
+         TrustAnswer::TrustAlways, ua::status::BadIdentityTokenInvalid, 0},
+        {"None on purpose, the certificate refused", MessageSecurityMode::None, encrypting(der),
+         TrustAnswer::Refuse, ua::status::BadCertificateUntrusted, 1},
+        {"None on purpose, an unreadable certificate", MessageSecurityMode::None,
+         encrypting("junk"), TrustAnswer::TrustAlways, ua::status::BadCertificateInvalid, 0},
+        {"None on purpose, the certificate trusted", MessageSecurityMode::None, encrypting(der),
+         TrustAnswer::TrustForSession, ua::status::Good, 1},
+    };
+    for (const Case& c : cases) {
+        SCOPED_TRACE(c.name);
+        question_.questions.clear();
+        question_.answer = c.answer;
+        prompt_.requests.clear();
+        prompt_.answers = {"secret"};
+        ChooseUser("bob", c.chosen);
+        auto options = builder_.Build(kUrl, {c.offered});
+        EXPECT_EQ(question_.questions.size(), c.questions);
+        if (c.refusal == ua::status::Good) {
+            ASSERT_TRUE(options) << options.Failure().text;
+            EXPECT_EQ(options.Value().identity.password, "secret");
+            continue;
+        }
+        ASSERT_FALSE(options);
+        EXPECT_EQ(options.Failure().status, c.refusal) << options.Failure().text;
+        EXPECT_TRUE(prompt_.requests.empty()) << "no password was asked for";
+    }
+}
+
+TEST_F(ConnectOptionsBuilderTest, TheMostSecureChoiceSaysWhyItSendsNoPasswordToAPlainServer) {
+    ChooseUser("bob");
+    auto options = builder_.Build(kUrl, {endpoints_[0]});
+    ASSERT_FALSE(options);
+    const std::string& text = options.Failure().text;
+    EXPECT_TRUE(text.starts_with("The program did not send the password of \"bob\" to \"" + kUrl +
+                                 "\": the server offers only connections without security"))
+        << text;
+    EXPECT_NE(text.find("--security-mode None"), std::string::npos) << text;
 }
 
 TEST_F(ConnectOptionsBuilderTest, AServerRefusingTheProgramIsToldWhichCertificateToTrust) {

@@ -73,6 +73,15 @@ Result<ExtensionObject> Anonymous(const EndpointDescription& endpoint) {
 
 }  // namespace
 
+PasswordRoute RouteOfPassword(const EndpointDescription& endpoint) {
+    const UserTokenPolicy* policy = PasswordPolicy(endpoint);
+    if (!policy) {
+        return PasswordRoute::Refused;
+    }
+    return FindPolicy(TokenPolicyUri(*policy, endpoint)) ? PasswordRoute::EncryptedToCertificate
+                                                         : PasswordRoute::InsideEncryptedChannel;
+}
+
 Result<ExtensionObject> MakeIdentityToken(const UserIdentity& identity,
                                           const EndpointDescription& endpoint,
                                           const ByteString& serverCertificate,

@@ -18,4 +18,10 @@ Result<ExtensionObject> MakeIdentityToken(const UserIdentity& identity,
                                           const ByteString& serverCertificate,
                                           const ByteString& serverNonce);
 
+// Whether a password can go to this endpoint without being readable on the
+// way, and if so whether it is encrypted to the endpoint's certificate (then
+// that certificate must be one the user trusts).
+enum class PasswordRoute { Refused, EncryptedToCertificate, InsideEncryptedChannel };
+PasswordRoute RouteOfPassword(const EndpointDescription& endpoint);
+
 }  // namespace cv::ua

@@ -42,6 +42,10 @@ void Session::Connect(const std::string& sEndpointUrl, ConnectOptions connect,
     connect_ = std::move(connect);
     info_ = {};
     info_.endpointUrl = sEndpointUrl;
+    if (auto checked = CheckEndpointCertificate(); !checked) {
+        asio::post(io_, [done = std::move(done), error = checked.Failure()] { done(error); });
+        return;
+    }
     OpenChannel(sEndpointUrl,
                 [weak = weak_from_this(), done = std::move(done)](Result<Done> opened) {
                     auto self = weak.lock();
@@ -130,6 +134,57 @@ void Session::CreateSession(std::function<void(Result<SessionInfo>)> done) {
         });
 }
 
+// The caller checked the endpoint's certificate; it must also be the
+// certificate of the application the endpoint describes.
+Result<Done> Session::CheckEndpointCertificate() const {
+    if (!GuardsIdentity()) {
+        return Done{};
+    }
+    if (!connect_.endpoint) {
+        return Error{status::BadIdentityTokenRejected,
+                     "A user name is only sent to a server whose certificate was checked, and "
+                     "none was given."};
+    }
+    auto certificate = crypto::Certificate::FromDer(connect_.endpoint->serverCertificate.bytes);
+    if (!certificate) {
+        return Error{status::BadCertificateInvalid,
+                     "The server's certificate cannot be read: " + certificate.Failure().text};
+    }
+    const std::string& described = connect_.endpoint->server.applicationUri;
+    const std::string named = certificate.Value().ApplicationUri();
+    if (!described.empty() && named != described) {
+        return Error{status::BadCertificateUriInvalid,
+                     "The server's certificate names the application \"" + named +
+                         "\", but its endpoint describes \"" + described + "\"."};
+    }
+    return Done{};
+}
+
+// What CreateSession answered must come from the server that was checked:
+// its certificate, and a nonce long enough to sign and encrypt with.
+Result<Done> Session::CheckCreatedServer(const CreateSessionResponse& created) const {
+    if (!GuardsIdentity()) {
+        return Done{};
+    }
+    auto shown = crypto::Certificate::FromDer(connect_.endpoint->serverCertificate.bytes);
+    if (!shown ||
+        !std::string_view(serverCertificate_.bytes).starts_with(shown.Value().LeafDer())) {
+        return Error{status::BadCertificateInvalid,
+                     "The server answered with another certificate than its endpoint shows."};
+    }
+    if (created.serverNonce.bytes.size() < kNonceSize) {
+        return Error{status::BadNonceInvalid,
+                     "The server's nonce is " + std::to_string(created.serverNonce.bytes.size()) +
+                         " bytes long; at least " + std::to_string(kNonceSize) +
+                         " are needed to keep the session safe."};
+    }
+    if (Secured()) {
+        return CheckSessionSignature(shown.Value(), connect_.credentials->certificate.Der(),
+                                     clientNonce_.bytes, created.serverSignature);
+    }
+    return Done{};
+}
+
 // The server's own description of the endpoint in use: the one discovery
 // offered must be among those CreateSession lists (a server that lists
 // none is taken at its discovery word).
@@ -168,19 +223,8 @@ Result<Done> Session::OnCreated(const CreateSessionResponse& created) {
     serverCertificate_ = created.serverCertificate.bytes.empty()
                              ? endpoint.Value().serverCertificate
                              : created.serverCertificate;
-    if (Secured()) {
-        auto shown = crypto::Certificate::FromDer(connect_.endpoint->serverCertificate.bytes);
-        if (!shown ||
-            !std::string_view(serverCertificate_.bytes).starts_with(shown.Value().LeafDer())) {
-            return Error{status::BadCertificateInvalid,
-                         "The server answered with another certificate than its endpoint shows."};
-        }
-        auto signature =
-            CheckSessionSignature(shown.Value(), connect_.credentials->certificate.Der(),
-                                  clientNonce_.bytes, created.serverSignature);
-        if (!signature) {
-            return signature.Failure();
-        }
+    if (auto checked = CheckCreatedServer(created); !checked) {
+        return checked;
     }
     authenticationToken_ = created.authenticationToken;
     serverNonce_ = created.serverNonce;

@@ -90,6 +90,12 @@ class Session : public std::enable_shared_from_this<Session> {
     bool Secured() const {
         return connect_.endpoint && connect_.endpoint->securityMode != MessageSecurityMode::None;
     }
+    bool Named() const { return connect_.identity.type == UserTokenType::UserName; }
+    // Something worth protecting goes to the server (keys or a password), so
+    // it must be the server whose certificate the caller checked.
+    bool GuardsIdentity() const { return Secured() || Named(); }
+    Result<Done> CheckEndpointCertificate() const;
+    Result<Done> CheckCreatedServer(const CreateSessionResponse& created) const;
     void StartKeepAlive();
     void OnKeepAlive(Result<ReadResponse> response);
     void Lose(const Error& reason);
