@@ -1,7 +1,10 @@
+#include <algorithm>
 #include <memory>
 #include <string>
+#include <vector>
 
 #include "document/TunFile.h"
+#include "opc/ClientErrors.h"
 #include "opc/CvOpcAutoClient.h"
 #include "platform/Platform.h"
 #include "util/ProgramRoutines.h"
@@ -55,24 +58,42 @@ bool TunFile::SingleShotRead() {
 }
 
 ErrorInfo TunFile::CreateOpcAutoObject(Channel& cChannel) {
-    CvOpcAutoClient* cClient = nullptr;
-    for (const std::unique_ptr<CvOpcAutoClient>& cEach : mcOpcClients) {
-        if (cEach->ServerID() == cChannel.OpcServerID() &&
-            cEach->ServerNode() == cChannel.OpcComputer()) {
-            cClient = cEach.get();
-            break;
-        }
-    }
-    if (cClient == nullptr) {
-        auto cNew = std::make_unique<CvOpcAutoClient>(mPlatform);
-        if (ErrorInfo error =
-                cNew->CreateServerAndGroup(cChannel.OpcServerID(), cChannel.OpcComputer())) {
+    std::shared_ptr<CvOpcAutoClient> cClient = FindOpcClient(cChannel);
+    if (!cClient) {
+        if (ErrorInfo error = NewOpcClient(cChannel, cClient)) {
             return error;
         }
-        cClient = cNew.get();
-        mcOpcClients.push_back(std::move(cNew));
     }
     return cClient->AddChannel(cChannel);
+}
+
+std::shared_ptr<CvOpcAutoClient> TunFile::FindOpcClient(const Channel& cChannel) const {
+    for (const std::shared_ptr<CvOpcAutoClient>& cEach : mcOpcClients) {
+        if (cEach->ServerID() == cChannel.OpcServerID() &&
+            cEach->ServerNode() == cChannel.OpcComputer()) {
+            return cEach;
+        }
+    }
+    return nullptr;
+}
+
+// The new client is listed while it connects, so that going offline meanwhile
+// ends it too; it stays only when it connected and is still listed.
+ErrorInfo TunFile::NewOpcClient(const Channel& cChannel,
+                                std::shared_ptr<CvOpcAutoClient>& cClient) {
+    auto cNew = std::make_shared<CvOpcAutoClient>(mPlatform);
+    mcOpcClients.push_back(cNew);
+    const ErrorInfo error =
+        cNew->CreateServerAndGroup(cChannel.OpcServerID(), cChannel.OpcComputer());
+    const auto found = std::find(mcOpcClients.begin(), mcOpcClients.end(), cNew);
+    if (!error && found != mcOpcClients.end()) {
+        cClient = std::move(cNew);
+        return {};
+    }
+    if (found != mcOpcClients.end()) {
+        mcOpcClients.erase(found);
+    }
+    return error ? error : ClientErrors::Disconnected();
 }
 
 // A failing client is reported and the others still go online.
@@ -92,7 +113,7 @@ void TunFile::OpcAutoGoOnline(int32_t lRate) {
 // waits on its server never meet a half-ended client there.
 void TunFile::OpcAutoGoOffline() {
     while (!mcOpcClients.empty()) {
-        std::unique_ptr<CvOpcAutoClient> cClient = std::move(mcOpcClients.front());
+        const std::shared_ptr<CvOpcAutoClient> cClient = std::move(mcOpcClients.front());
         mcOpcClients.erase(mcOpcClients.begin());
         (void)cClient->GoOffline();
     }
