@@ -27,6 +27,7 @@ bool Channel::OKtoGoOnline(const TunFile& cTunFile) const {
 bool Channel::CreateCommsObjects(TunFile& cTunFile, int32_t& lButtons, std::string& sText,
                                  bool bSilent) {
     msErrorStr.clear();
+    mbServerShutDown = false;
     if (!OKtoGoOnline(cTunFile)) {
         return false;
     }

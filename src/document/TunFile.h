@@ -133,8 +133,9 @@ class TunFile {
     void OpcAutoGoOnline(int32_t lRate);
     // Ends every client and empties the list.
     void OpcAutoGoOffline();
-    // One device read of group lGroup through every client, up to the first
-    // that fails.
+    // One device read of group lGroup through every connected client, up to
+    // the first that fails. A client that ends while it reads stops the read
+    // without a message of its own.
     ErrorInfo OpcAutoSingleShotRead(int32_t lGroup);
 
   private:

@@ -119,11 +119,22 @@ void TunFile::OpcAutoGoOffline() {
     }
 }
 
+// Reads through the clients listed at the start, since events during a read
+// may change the list. A client that ended (its server shut down, or the
+// document went offline) has nothing to read; one that ends while it reads
+// was ended by a shutdown that was told or by a close that was asked for,
+// so its failure is not shown again.
 ErrorInfo TunFile::OpcAutoSingleShotRead(int32_t lGroup) {
-    for (size_t i = 0; i < mcOpcClients.size(); ++i) {
-        if (ErrorInfo error = mcOpcClients[i]->SingleShotReadGroup(lGroup)) {
-            mPlatform.dialogs.MsgBox(ProgramTitle() + " Error: OpcAutoSingleShotRead",
-                                     MsgBoxStyle::OKOnly, "");
+    const std::vector<std::shared_ptr<CvOpcAutoClient>> cClients = mcOpcClients;
+    for (const std::shared_ptr<CvOpcAutoClient>& cClient : cClients) {
+        if (!cClient->IsConnected()) {
+            continue;
+        }
+        if (ErrorInfo error = cClient->SingleShotReadGroup(lGroup)) {
+            if (cClient->IsConnected()) {
+                mPlatform.dialogs.MsgBox(ProgramTitle() + " Error: OpcAutoSingleShotRead",
+                                         MsgBoxStyle::OKOnly, "");
+            }
             return error;
         }
     }

@@ -209,6 +209,10 @@ void ItemTest::Refresh() {
 }
 
 void ItemTest::ShowReadError(const std::string& sPrefix, int32_t lIcon) {
+    // The server's shutdown was told by the OPC client already.
+    if (mcChannel.ServerShutDown()) {
+        return;
+    }
     int32_t lButtons = 0;
     std::string sQuestion;
     std::string sError = mcChannel.ErrorStr();

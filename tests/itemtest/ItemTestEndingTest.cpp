@@ -1,5 +1,6 @@
-// How a test read ends: closed by the user while a server call waits.
-// Nothing is left connected or running.
+// How a test read ends: closed by the user while a server call waits, or by
+// its server shutting down. Either way nothing is left connected or running,
+// and nothing more is said than what happened.
 
 #include <gtest/gtest.h>
 
@@ -118,6 +119,67 @@ TEST_P(ClosingWhileCreating, LeavesNothingForTheNextTestRead) {
 }
 
 INSTANTIATE_TEST_SUITE_P(At, ClosingWhileCreating, testing::Values(1000u, 7000u, 19000u, 27000u));
+
+// Closed while a one-shot read of the slow server waits: nothing is said.
+TEST_F(ItemTestEnding, ClosingDuringAOneShotReadReportsNothing) {
+    cTunFile.General().SetUseHotLinks(false);
+    Begin(kSlow, "Unit1.FIC101.PV");
+    t.events.Advance(60000);
+    ASSERT_EQ(test->State(), 6);
+    t.dialogs.Clear();
+    CloseWhen([this] { return test->InTimer(); });
+    t.events.Advance(20000);
+    ASSERT_GT(closedAtTrace, 0u);
+    EXPECT_EQ(t.trace.Entries()[closedAtTrace - 1].label, "Group.SyncRead , Items=1");
+    EXPECT_TRUE(t.dialogs.Messages().empty()) << t.dialogs.Last().text;
+    ExpectNothingLeft();
+}
+
+struct ShutDownCase {
+    const char* server;
+    const char* item;
+    bool hotLinks;
+    int16_t state;     // when the server shuts down
+    bool duringRead;   // and while a one-shot read waits
+    uint32_t readyMs;  // till then
+};
+
+// Whenever the server shuts down, its one message is all the user sees, and
+// the test stops reading.
+TEST_F(ItemTestEnding, AServerShutDownIsToldOnceAndReadingStops) {
+    const ShutDownCase cases[] = {
+        {kPlant, "Signals.Ramp", true, 6, false, 2000},
+        {kPlant, "Signals.Ramp", false, 6, false, 2000},
+        {kPlant, "Quality.CommFailure", true, 5, false, 2000},
+        {kSlow, "Unit1.FIC101.PV", false, 6, true, 60000},
+    };
+    for (const ShutDownCase& c : cases) {
+        SCOPED_TRACE(std::string(c.item) + (c.hotLinks ? " hot" : " cold"));
+        t.dialogs.Clear();
+        closes = 0;
+        cTunFile.General().SetUseHotLinks(c.hotLinks);
+        Begin(c.server, c.item);
+        t.events.Advance(c.readyMs);
+        ASSERT_EQ(test->State(), c.state);
+        size_t tracedBefore = 0;
+        AtFirst([&] { return test->InTimer() || !c.duringRead; },
+                [&] {
+                    tracedBefore = t.trace.Entries().size();
+                    ASSERT_FALSE(t.plant.ShutDownServer("", c.server, "Maintenance"));
+                });
+        t.events.Advance(10000);
+        EXPECT_EQ(closes, 1);
+        ASSERT_EQ(t.dialogs.Messages().size(), 1u) << t.dialogs.Last().text;
+        EXPECT_EQ(t.dialogs.Last().text, "The OPC Server has been shutdown");
+        EXPECT_TRUE(t.modeless.windows.empty());
+        const auto& entries = t.trace.Entries();
+        EXPECT_EQ(std::count_if(
+                      entries.begin() + static_cast<std::ptrdiff_t>(tracedBefore), entries.end(),
+                      [](const auto& e) { return e.label.find("SyncRead") != std::string::npos; }),
+                  0);
+        ExpectNothingLeft();
+    }
+}
 
 }  // namespace
 }  // namespace cv
