@@ -181,6 +181,10 @@ class Channel {
     void OpcSetRawValue(const Variant& vValue, int32_t lQuality, double dTimeStamp,
                         bool bSingleShot);
     void OpcDataChange(const std::string& sText);
+    // The client marks the channels it served when their server shut down
+    // (and says so itself); the mark lasts until CreateCommsObjects.
+    void OpcServerShutDown() { mbServerShutDown = true; }
+    bool ServerShutDown() const { return mbServerShutDown; }
     // The OPC client serving this channel and the channel's OPC item, set by
     // the client when it adds the channel and released when the channel goes
     // offline; the client is not owned here.
@@ -260,6 +264,7 @@ class Channel {
     bool mbNeedsScaling = false;
     bool mbScalePriorToOutput = false;
     std::string msErrorStr;
+    bool mbServerShutDown = false;
     int32_t miState = OnlineState::Offline;
     int32_t miSendResult = 0;
     std::string msItemName;

@@ -27,6 +27,7 @@ bool Channel::OKtoGoOnline(const TunFile& cTunFile) const {
 bool Channel::CreateCommsObjects(TunFile& cTunFile, int32_t& lButtons, std::string& sText,
                                  bool bSilent) {
     msErrorStr.clear();
+    mbServerShutDown = false;
     if (!OKtoGoOnline(cTunFile)) {
         return false;
     }
@@ -122,7 +123,11 @@ bool Channel::SingleShotRead(TunFile& cTunFile, bool bSilent) {
     std::string sText;
     switch (miComType) {
         case ComTypeCode::Dde:
-            if (!mcDdeLabel || mcDdeLabel->SetLinkItem(msItemName)) {
+            if (!mcDdeLabel) {
+                return false;
+            }
+            if (ErrorInfo error = mcDdeLabel->SetLinkItem(msItemName)) {
+                ReportCommsError(error, lButtons, sText, bSilent);
                 return false;
             }
             return GoOnline(cTunFile, lButtons, sText, bSilent);

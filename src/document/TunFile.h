@@ -122,20 +122,25 @@ class TunFile {
     bool SingleShotRead();
 
     // The OPC clients, one per server ID and computer, in creation order;
-    // they exist only while online.
-    const std::vector<std::unique_ptr<CvOpcAutoClient>>& OpcClients() const { return mcOpcClients; }
+    // they exist only while online. A client joins the list as it starts to
+    // connect.
+    const std::vector<std::shared_ptr<CvOpcAutoClient>>& OpcClients() const { return mcOpcClients; }
     // Serves the channel by the client of its server and computer, which is
-    // created and connected first when there is none.
+    // created and connected first when there is none. Going offline while
+    // that client connects ends it, and the channel is not served.
     ErrorInfo CreateOpcAutoObject(Channel& cChannel);
     // Every client's main group: update rate lRate (ms) and notifications on.
     void OpcAutoGoOnline(int32_t lRate);
     // Ends every client and empties the list.
     void OpcAutoGoOffline();
-    // One device read of group lGroup through every client, up to the first
-    // that fails.
+    // One device read of group lGroup through every connected client, up to
+    // the first that fails. A client that ends while it reads stops the read
+    // without a message of its own.
     ErrorInfo OpcAutoSingleShotRead(int32_t lGroup);
 
   private:
+    std::shared_ptr<CvOpcAutoClient> FindOpcClient(const Channel& cChannel) const;
+    ErrorInfo NewOpcClient(const Channel& cChannel, std::shared_ptr<CvOpcAutoClient>& cClient);
     int32_t ArchiveNumber(int32_t lNumber) const;
     Channel* ArchiveObj(int32_t lNumber) const;
     void CopyFaceplateRanges();
@@ -150,7 +155,9 @@ class TunFile {
     cv::TunerType mcTunerType;
     std::unique_ptr<TunFileGeneral> mcGeneral;
     ModeMapClass mcModeMap;
-    std::vector<std::unique_ptr<CvOpcAutoClient>> mcOpcClients;
+    // Shared, so that a member waiting on a client keeps it while events
+    // take it out of the list.
+    std::vector<std::shared_ptr<CvOpcAutoClient>> mcOpcClients;
 };
 
 }  // namespace cv

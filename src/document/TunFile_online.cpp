@@ -1,7 +1,10 @@
+#include <algorithm>
 #include <memory>
 #include <string>
+#include <vector>
 
 #include "document/TunFile.h"
+#include "opc/ClientErrors.h"
 #include "opc/CvOpcAutoClient.h"
 #include "platform/Platform.h"
 #include "util/ProgramRoutines.h"
@@ -55,24 +58,42 @@ bool TunFile::SingleShotRead() {
 }
 
 ErrorInfo TunFile::CreateOpcAutoObject(Channel& cChannel) {
-    CvOpcAutoClient* cClient = nullptr;
-    for (const std::unique_ptr<CvOpcAutoClient>& cEach : mcOpcClients) {
-        if (cEach->ServerID() == cChannel.OpcServerID() &&
-            cEach->ServerNode() == cChannel.OpcComputer()) {
-            cClient = cEach.get();
-            break;
-        }
-    }
-    if (cClient == nullptr) {
-        auto cNew = std::make_unique<CvOpcAutoClient>(mPlatform);
-        if (ErrorInfo error =
-                cNew->CreateServerAndGroup(cChannel.OpcServerID(), cChannel.OpcComputer())) {
+    std::shared_ptr<CvOpcAutoClient> cClient = FindOpcClient(cChannel);
+    if (!cClient) {
+        if (ErrorInfo error = NewOpcClient(cChannel, cClient)) {
             return error;
         }
-        cClient = cNew.get();
-        mcOpcClients.push_back(std::move(cNew));
     }
     return cClient->AddChannel(cChannel);
+}
+
+std::shared_ptr<CvOpcAutoClient> TunFile::FindOpcClient(const Channel& cChannel) const {
+    for (const std::shared_ptr<CvOpcAutoClient>& cEach : mcOpcClients) {
+        if (cEach->ServerID() == cChannel.OpcServerID() &&
+            cEach->ServerNode() == cChannel.OpcComputer()) {
+            return cEach;
+        }
+    }
+    return nullptr;
+}
+
+// The new client is listed while it connects, so that going offline meanwhile
+// ends it too; it stays only when it connected and is still listed.
+ErrorInfo TunFile::NewOpcClient(const Channel& cChannel,
+                                std::shared_ptr<CvOpcAutoClient>& cClient) {
+    auto cNew = std::make_shared<CvOpcAutoClient>(mPlatform);
+    mcOpcClients.push_back(cNew);
+    const ErrorInfo error =
+        cNew->CreateServerAndGroup(cChannel.OpcServerID(), cChannel.OpcComputer());
+    const auto found = std::find(mcOpcClients.begin(), mcOpcClients.end(), cNew);
+    if (!error && found != mcOpcClients.end()) {
+        cClient = std::move(cNew);
+        return {};
+    }
+    if (found != mcOpcClients.end()) {
+        mcOpcClients.erase(found);
+    }
+    return error ? error : ClientErrors::Disconnected();
 }
 
 // A failing client is reported and the others still go online.
@@ -92,17 +113,28 @@ void TunFile::OpcAutoGoOnline(int32_t lRate) {
 // waits on its server never meet a half-ended client there.
 void TunFile::OpcAutoGoOffline() {
     while (!mcOpcClients.empty()) {
-        std::unique_ptr<CvOpcAutoClient> cClient = std::move(mcOpcClients.front());
+        const std::shared_ptr<CvOpcAutoClient> cClient = std::move(mcOpcClients.front());
         mcOpcClients.erase(mcOpcClients.begin());
         (void)cClient->GoOffline();
     }
 }
 
+// Reads through the clients listed at the start, since events during a read
+// may change the list. A client that ended (its server shut down, or the
+// document went offline) has nothing to read; one that ends while it reads
+// was ended by a shutdown that was told or by a close that was asked for,
+// so its failure is not shown again.
 ErrorInfo TunFile::OpcAutoSingleShotRead(int32_t lGroup) {
-    for (size_t i = 0; i < mcOpcClients.size(); ++i) {
-        if (ErrorInfo error = mcOpcClients[i]->SingleShotReadGroup(lGroup)) {
-            mPlatform.dialogs.MsgBox(ProgramTitle() + " Error: OpcAutoSingleShotRead",
-                                     MsgBoxStyle::OKOnly, "");
+    const std::vector<std::shared_ptr<CvOpcAutoClient>> cClients = mcOpcClients;
+    for (const std::shared_ptr<CvOpcAutoClient>& cClient : cClients) {
+        if (!cClient->IsConnected()) {
+            continue;
+        }
+        if (ErrorInfo error = cClient->SingleShotReadGroup(lGroup)) {
+            if (cClient->IsConnected()) {
+                mPlatform.dialogs.MsgBox(ProgramTitle() + " Error: OpcAutoSingleShotRead",
+                                         MsgBoxStyle::OKOnly, "");
+            }
             return error;
         }
     }

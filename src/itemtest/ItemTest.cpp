@@ -127,6 +127,9 @@ void ItemTest::Create() {
     int32_t lButtons = MsgBoxStyle::Exclamation;
     std::string sText;
     const bool bCreated = mcChannel.CreateCommsObjects(mcTunFile, lButtons, sText, true);
+    if (mbUnloaded) {
+        return;  // closed while the client connected
+    }
     NoteBackend();
     if (bCreated) {
         miState = 4;
@@ -206,6 +209,10 @@ void ItemTest::Refresh() {
 }
 
 void ItemTest::ShowReadError(const std::string& sPrefix, int32_t lIcon) {
+    // The server's shutdown was told by the OPC client already.
+    if (mcChannel.ServerShutDown()) {
+        return;
+    }
     int32_t lButtons = 0;
     std::string sQuestion;
     std::string sError = mcChannel.ErrorStr();
@@ -224,7 +231,7 @@ void ItemTest::NoteBackend() {
     if (!mDisplay.backend.empty()) {
         return;
     }
-    for (const std::unique_ptr<CvOpcAutoClient>& cClient : mcTunFile.OpcClients()) {
+    for (const std::shared_ptr<CvOpcAutoClient>& cClient : mcTunFile.OpcClients()) {
         if (cClient->ServerID() == mcChannel.OpcServerID() &&
             cClient->ServerNode() == mcChannel.OpcComputer()) {
             mDisplay.backend = cClient->BackendName();

@@ -40,6 +40,9 @@ class CvOpcAutoClient {
     CvOpcAutoClient(const CvOpcAutoClient&) = delete;
     CvOpcAutoClient& operator=(const CvOpcAutoClient&) = delete;
 
+    // True while the client holds a server: from CreateServerAndGroup until
+    // it goes offline (which its server's shutdown makes it do).
+    bool IsConnected() const { return mcOpcServer != nullptr; }
     // The server's ID and computer; empty without a server.
     std::string ServerID() const;
     std::string ServerNode() const;
@@ -86,7 +89,8 @@ class CvOpcAutoClient {
     // handle; a handle of no channel of the group ends the notification.
     void mcOpcGroup1_DataChange(const platform::DataChangeArgs& args);
     void mcOpcGroup2_DataChange(const platform::DataChangeArgs& args);
-    // The server's shutdown: goes offline and says so once.
+    // The server's shutdown: goes offline and says so once; the channels it
+    // served learn why they are offline (Channel::ServerShutDown).
     void mcOpcServer_ServerShutDown(const std::string& sReason);
 
     // The channels served, in the order added.

@@ -155,6 +155,11 @@ void CvOpcAutoClient::ChannelDataChange(int32_t lGroup, const platform::DataChan
 
 void CvOpcAutoClient::mcOpcServer_ServerShutDown(const std::string&) {
     platform::Dialogs& dialogs = mPlatform.dialogs;
+    for (const ServedChannels::Entry& entry : mcChannels.InOrder()) {
+        if (Channel* cChannel = entry.Get()) {
+            cChannel->OpcServerShutDown();
+        }
+    }
     // The server's calls fail from now on; the client ends all the same.
     (void)GoOffline();
     dialogs.MsgBox("The OPC Server has been shutdown", MsgBoxStyle::OKOnly, "");

@@ -98,6 +98,30 @@ TEST_F(DdeChannel, AutomaticLinksFollowTheApplicationManualOnesKeepTheirValue) {
     EXPECT_EQ(channel.RawValue(), Variant::Str("53"));
 }
 
+// A live link refuses the new item at once: the read fails like any other.
+TEST_F(DdeChannel, AOneShotReadWhoseItemIsRefusedIsReported) {
+    for (const bool bSilent : {true, false}) {
+        SCOPED_TRACE(bSilent);
+        tp.dialogs.Clear();
+        document.General().SetUseHotLinks(true);
+        Attach("PLC5|LIC20", "PV");
+        ASSERT_TRUE(GoOnline(true));
+        channel.SetItemName("NOPE");
+        EXPECT_FALSE(channel.SingleShotRead(document, bSilent));
+        EXPECT_EQ(channel.Online(false), OnlineState::Offline);
+        if (bSilent) {
+            EXPECT_EQ(FirstLine(), "DDE Link Error.");
+            EXPECT_TRUE(tp.dialogs.Messages().empty());
+        } else {
+            ASSERT_EQ(tp.dialogs.Messages().size(), 1u);
+            EXPECT_EQ(tp.dialogs.Last().title, "Error trying to read PV");
+            EXPECT_EQ(tp.dialogs.Last().style, MsgBoxStyle::Critical);
+            EXPECT_NE(tp.dialogs.Last().text.find("PV item name \"NOPE\""), std::string::npos);
+        }
+        channel.ClearCommunicationsObject();
+    }
+}
+
 TEST_F(DdeChannel, ATextWhereANumberIsExpectedTakesTheChannelOffline) {
     channel.SetExpectANumber(true);
     Attach("PLC5|LIC20", "TAG");

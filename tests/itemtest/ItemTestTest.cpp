@@ -200,18 +200,6 @@ TEST_F(ItemTestTest, TheSlowServerShowsItsBusyNoticeAndStillDelivers) {
     EXPECT_EQ(cTunFile.OpcClients().size(), 1u);
 }
 
-TEST_F(ItemTestTest, AServerThatShutsDownEndsTheTestWithItsMessage) {
-    Begin(kPlant, "Signals.Ramp");
-    t.events.Advance(2000);
-    ASSERT_EQ(test->State(), 6);
-    ASSERT_FALSE(t.plant.ShutDownServer("", kPlant, "Maintenance"));
-    t.events.Advance(2000);
-    EXPECT_EQ(closes, 1);
-    EXPECT_TRUE(Said("The OPC Server has been shutdown"));
-    EXPECT_EQ(t.dialogs.Last().title, "Error reading Signals.Ramp");
-    EXPECT_EQ(t.dialogs.Last().style & 0x70, MsgBoxStyle::Critical);
-}
-
 TEST_F(ItemTestTest, WithHotLinksOffEveryRefreshReadsOnce) {
     for (const bool hot : {true, false}) {
         cTunFile.General().SetUseHotLinks(hot);

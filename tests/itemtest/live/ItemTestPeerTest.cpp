@@ -1,6 +1,6 @@
 // The item test against the node-opcua peer, on a real event loop: what the
-// test window shows for good, uncertain and bad values, and for a server
-// that shuts down while it reads.
+// test window shows for good, uncertain and bad values, for a server that
+// shuts down while it reads, and what a test closed while connecting leaves.
 
 #include <gtest/gtest.h>
 
@@ -34,12 +34,34 @@ struct ItemTestPeer : LiveUaTest, ItemTest::Listener {
         });
     }
 
-    void DisplayChanged() override {}
+    // The peer's sessions now, read through the fixture's own client.
+    int32_t Sessions() {
+        if (sessionCount == nullptr) {
+            sessionCount = &AddChannel("Control.SessionCount");
+        }
+        EXPECT_FALSE(client.SingleShotReadOneItem(*sessionCount));
+        return sessionCount->RawValue().AsI4();
+    }
+
+    // With closeWhileCreating, the user closes the test 1 ms after it began
+    // to create its client, while the client waits for the peer.
+    void DisplayChanged() override {
+        if (closeWhileCreating && itemTest->State() == 2) {
+            closeWhileCreating = false;
+            lp.events.StartTimer(1, false, [this] {
+                itemTest->Unload();
+                unloaded = true;
+            });
+        }
+    }
     void CloseRequested() override { ++closes; }
     void ValuesShown() override { ++refreshes; }
 
     TunFile doc{lp.platform};
     std::unique_ptr<ItemTest> itemTest;
+    Channel* sessionCount = nullptr;
+    bool closeWhileCreating = false;
+    bool unloaded = false;
     int closes = 0;
     int refreshes = 0;
 };
@@ -86,8 +108,30 @@ TEST_F(ItemTestPeer, PeerShutdownDuringATestReadEndsIt) {
     }
     ASSERT_TRUE(WaitUntil([&] { return closes > 0; }));
     EXPECT_TRUE(itemTest->Closed());
-    EXPECT_TRUE(Said("Error reading Dynamic.Counter"));
+    // The shutdown is told by the clients (the fixture's too), not again by
+    // the test.
+    EXPECT_TRUE(Said("The OPC Server has been shutdown"));
+    EXPECT_FALSE(Said("Error reading"));
     EXPECT_TRUE(doc.OpcClients().empty());
+}
+
+TEST_F(ItemTestPeer, ClosingWhileConnectingLeavesNoSession) {
+    const int32_t before = Sessions();
+    ASSERT_GE(before, 1) << "the fixture's own session";
+    closeWhileCreating = true;
+    Begin("Plant.Area1.FIC101.PV");
+    // The outer wait sees the flag only once the create has given up.
+    ASSERT_TRUE(WaitUntil([&] { return unloaded; }));
+    EXPECT_TRUE(doc.OpcClients().empty());
+    EXPECT_EQ(refreshes, 0);
+    // The peer may take a moment to drop a session whose channel closed.
+    int32_t after = Sessions();
+    for (int poll = 0; poll < 50 && after > before; ++poll) {
+        (void)lp.events.WaitUntil([] { return false; }, 100);
+        after = Sessions();
+    }
+    EXPECT_LE(after, before);
+    EXPECT_TRUE(lp.dialogs.Messages().empty());
 }
 
 }  // namespace

@@ -260,8 +260,19 @@ function addBulkFolder(ns, objects, count, startTime) {
 // values of Control.ShutdownReason and Control.ShutdownDelay.
 // Control.TrustRejected: writing true awaits onTrustRejected() before the
 // Write is answered (the client certificates the peer refused become trusted).
-function addControlFolder(ns, objects, onShutdown, onTrustRejected) {
+// Control.SessionCount: the sessions open now, so a test can see that a client
+// it ended left none behind.
+function addControlFolder(ns, objects, onShutdown, onTrustRejected, sessionCount) {
     const folder = addFolder(ns, objects, "Control");
+    ns.addVariable({
+        organizedBy: folder,
+        nodeId: "s=Control.SessionCount",
+        browseName: "SessionCount",
+        dataType: "Int32",
+        accessLevel: READ_ONLY,
+        userAccessLevel: READ_ONLY,
+        value: { get: () => makeVariant(DataType.Int32, sessionCount()) }
+    });
     ns.addVariable({
         organizedBy: folder,
         nodeId: "s=Control.TrustRejected",
@@ -307,7 +318,8 @@ function buildAddressSpace(server, options) {
     addSlowFolder(ns, objects, options.slowMs);
     addLargeFolder(ns, objects);
     addBulkFolder(ns, objects, options.bulk, startTime);
-    addControlFolder(ns, objects, options.onShutdown, options.onTrustRejected);
+    addControlFolder(ns, objects, options.onShutdown, options.onTrustRejected,
+        () => server.engine.currentSessionCount);
     return { stop: stopDynamic };
 }
 

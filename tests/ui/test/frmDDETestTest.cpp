@@ -184,7 +184,9 @@ class frmDDETestTest : public QObject {
         QVERIFY(!tp->plant.ShutDownServer("", kPlant, "Maintenance"));
         Advance(2000);
         QVERIFY(!window->isVisible());
-        QCOMPARE(tp->dialogs.Last().title, std::string("Error reading Signals.Ramp"));
+        // The OPC client's message is the only one.
+        QCOMPARE(tp->dialogs.Messages().size(), size_t{1});
+        QCOMPARE(tp->dialogs.Last().text, std::string("The OPC Server has been shutdown"));
     }
 
     void hotLinksOffReadsEachRefresh() {
