@@ -9,6 +9,7 @@
 #include "ua/secure/NoneSecurityPolicy.h"
 #include "ua/secure/SessionSignature.h"
 #include "ua/services/ViewServices.h"
+#include "ua/types/PlainText.h"
 
 namespace cv::ua {
 namespace {
@@ -275,7 +276,7 @@ void Session::OnKeepAlive(Result<ReadResponse> response) {
             if (events_) {
                 events_(ConnectionEvent::ServerShutdown,
                         Error{status::BadShutdown, reason && !reason->text.empty()
-                                                       ? reason->text
+                                                       ? PlainText(reason->text)
                                                        : "The server is shutting down."});
             }
         }
