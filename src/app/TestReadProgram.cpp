@@ -3,6 +3,7 @@
 #include <cstdlib>
 #include <iostream>
 
+#include "app/PlainOutput.h"
 #include "itemtest/CommandLineTestRead.h"
 #include "itemtest/TestReadCommandLine.h"
 #include "platform/Platform.h"
@@ -54,23 +55,29 @@ security::RunChoices RunChoicesOf(const TestReadOptions& options) {
     return choices;
 }
 
+// Standard output and error carry no control characters but line breaks and
+// tabs, whatever a server sent.
 int Run(const TestReadOptions& options, const std::vector<std::string>& arguments) {
+    PlainOutput plainOut(std::cout);
+    PlainOutput plainErr(std::cerr);
+    std::ostream out(&plainOut);
+    std::ostream err(&plainErr);
     const sim::PlantChoice choice = sim::ChoosePlant(
         sim::UserPlantFile(arguments, std::getenv(sim::kPlantEnvironmentVariable)));
     if (!choice.message.empty()) {
-        std::cerr << posix::ConsoleDialogs::PlainLines(choice.message) << '\n';
+        err << posix::ConsoleDialogs::PlainLines(choice.message) << '\n';
         return TestReadExit::kPlantUnusable;
     }
-    posix::ConsoleDialogs dialogs(std::cerr);
+    posix::ConsoleDialogs dialogs(err);
     posix::ConsoleLocale locale;
     posix::PosixProgramInfo program;
-    posix::ConsoleHelp help(std::cerr);
+    posix::ConsoleHelp help(err);
     posix::HostComputerName computer;
     posix::SteadyEventLoop events;
     posix::FileRegistry registry;
     posix::FileProfiles profiles;
     RunSwitches run;
-    posix::ConsoleBusyNotice busy(std::cerr);
+    posix::ConsoleBusyNotice busy(err);
     platform::ServerCallWait serverCalls(events, busy);
     sim::SimulatedPlant plant(choice.plant, serverCalls,
                               sim::PlantOptions{computer.Query().value_or(""), {}});
@@ -89,12 +96,12 @@ int Run(const TestReadOptions& options, const std::vector<std::string>& argument
     uaopc::UaBackend ua(serverCalls, uaOptions);
     platform::RoutingServerFactory servers(plant, ua);
     platform::TraceLog trace;
-    posix::ConsoleModeless modeless(std::cerr);
+    posix::ConsoleModeless modeless(err);
     Platform platform{
         dialogs,  locale, program, help,        computer, events,          registry,
         profiles, run,    servers, serverCalls, trace,    plant.NetEnum(), plant.DdeServers(),
         modeless};
-    return CommandLineTestRead(platform, options, std::cout, std::cerr).Run();
+    return CommandLineTestRead(platform, options, out, err).Run();
 }
 
 }  // namespace

@@ -16,6 +16,8 @@
 #include <vector>
 
 #include "support/TempFolder.h"
+#include "ua/ScriptedServer.h"
+#include "ua/services/MonitoredItemServices.h"
 
 extern char** environ;
 
@@ -125,6 +127,61 @@ TEST(TestReadProcess, FailuresPrintTheDiagnosisAndExitOne) {
         EXPECT_EQ(outcome.exitCode, 1) << c.diagnosis;
         EXPECT_EQ(outcome.out, "");
         EXPECT_NE(outcome.err.find(c.diagnosis), std::string::npos) << outcome.err;
+    }
+}
+
+// Standard error holds no control character but line breaks and tabs.
+bool HasControls(const std::string& text) {
+    for (size_t i = 0; i < text.size(); ++i) {
+        const auto byte = static_cast<unsigned char>(text[i]);
+        const bool c1 = byte == 0xC2 && i + 1 < text.size() &&
+                        (static_cast<unsigned char>(text[i + 1]) & 0xE0) == 0x80;
+        if ((byte < 0x20 && byte != '\n' && byte != '\t') || byte == 0x7F || c1) {
+            return true;
+        }
+    }
+    return false;
+}
+
+// Texts that would retitle the terminal, clear it and start a C1 escape (and
+// from the OPC UA server, draw a value line of its own): the reason an OPC UA
+// server gives for refusing to watch the item, and a plant's text value the
+// program quotes as no number.
+TEST(TestReadProcess, ServerTextsReachTheTerminalWithoutControls) {
+    const std::string reason =
+        "late\x1b]0;owned\x07\x1b[2J\n12:00:00.000\t42.5\t42.5\tgood\xc2\x9b"
+        "31m";
+    using cv::ua::test::ScriptedServer;
+    ScriptedServer server([&reason](ScriptedServer& s, const ScriptedServer::Request& r) {
+        if (r.typeId != cv::ua::CreateMonitoredItemsRequest::kEncodingId) {
+            return false;
+        }
+        s.SendChunk(
+            cv::ua::MessageKind::Message, 'A', r.requestId,
+            cv::ua::Encode(cv::ua::ErrorMessage{cv::ua::status::BadTcpInternalError, reason}));
+        return true;
+    });
+    const cv::test::TempFolder folder;
+    const std::string plant = folder.File("plant.json");
+    std::ofstream(plant) << R"({"computers": [{"name": "HERE", "local": true, "servers": ["S.1"]}],
+        "servers": [{"id": "S.1", "namespace": {"items": [{"name": "Text", "type": "BSTR",
+        "value": "late\u001b]0;owned\u0007\u001b[2J\u009b31m\u202e"}]}}]})";
+    const struct {
+        std::vector<std::string> arguments;
+        std::string shown;
+    } cases[] = {
+        {{"--test-read", server.Url(), "--item", "ns=1;s=X", "--security-mode", "None"},
+         "late]0;owned[2J 12:00:00.000 42.5 42.5 good31m"},
+        {{"--test-read", "S.1", "--item", "Text", "--plant", plant}, "late]0;owned[2J31m"},
+    };
+    for (const auto& c : cases) {
+        std::vector<std::string> arguments = c.arguments;
+        arguments.insert(arguments.end(), {"--timeout", "0.3"});
+        const Outcome outcome = RunProgram(arguments);
+        EXPECT_EQ(outcome.exitCode, 1);
+        EXPECT_EQ(outcome.out, "");
+        EXPECT_NE(outcome.err.find(c.shown), std::string::npos) << outcome.err;
+        EXPECT_FALSE(HasControls(outcome.err)) << outcome.err;
     }
 }
 
