@@ -126,7 +126,7 @@ void ScriptedServer::Answer(const Request& request) {
             CreateSessionResponse response;
             response.sessionId = NodeId(1, 1u);
             response.authenticationToken = NodeId(1, std::string("token"));
-            response.revisedSessionTimeout = 60'000;
+            response.revisedSessionTimeout = sessionTimeoutMs;
             response.serverEndpoints = {NoneEndpoint(Url())};
             Reply(request, response);
             return;

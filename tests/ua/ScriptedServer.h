@@ -51,6 +51,8 @@ class ScriptedServer {
     // What the Acknowledge offers; set before the client connects.
     AcknowledgeMessage acknowledge{0, 65535, 65535, 0, 0};
     uint32_t tokenLifetimeMs = 600'000;
+    // The session time-out CreateSession answers.
+    double sessionTimeoutMs = 60'000;
 
     // For the script, on the server's thread.
     template <class Response>

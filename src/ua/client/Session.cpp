@@ -17,10 +17,22 @@ namespace {
 constexpr size_t kNonceSize = 32;
 constexpr int32_t kServerStateShutdown = 4;
 constexpr uint32_t kMinKeepAliveMs = 100;
+constexpr double kMinSessionTimeoutMs = 1'000;
+constexpr double kMaxSessionTimeoutMs = 3'600'000;
 
 bool IsBinary(const EndpointDescription& endpoint) {
     return endpoint.transportProfileUri.empty() ||
            endpoint.transportProfileUri.ends_with("uatcp-uasc-uabinary");
+}
+
+// The session time-out paces the keep-alive reads (a third of it) and bounds
+// how long a broken connection is resumed. Below a second the reads would
+// flood the server; past an hour the program would go on resuming a session
+// the server has long forgotten (a hostile 1e12 would mean years). A value
+// that is no positive number (NaN, 0, negative) leaves what was asked for.
+uint32_t UsableSessionTimeout(double revisedMs, uint32_t requestedMs) {
+    const double ms = revisedMs > 0 ? revisedMs : requestedMs;
+    return static_cast<uint32_t>(std::clamp(ms, kMinSessionTimeoutMs, kMaxSessionTimeoutMs));
 }
 
 }  // namespace
@@ -186,7 +198,8 @@ Result<Done> Session::OnCreated(const CreateSessionResponse& created) {
     authenticationToken_ = created.authenticationToken;
     serverNonce_ = created.serverNonce;
     info_.sessionId = created.sessionId;
-    info_.revisedSessionTimeoutMs = created.revisedSessionTimeout;
+    info_.revisedSessionTimeoutMs =
+        UsableSessionTimeout(created.revisedSessionTimeout, options_.requestedSessionTimeoutMs);
     info_.endpoint = std::move(endpoint.Value());
     return Done{};
 }
@@ -240,10 +253,8 @@ void Session::ActivateSession(std::function<void(Result<SessionInfo>)> done) {
 }
 
 void Session::StartKeepAlive() {
-    const auto third = static_cast<uint32_t>(info_.revisedSessionTimeoutMs / 3);
-    const uint32_t interval =
-        std::max(kMinKeepAliveMs, third ? std::min(third, options_.keepAliveIntervalMs)
-                                        : options_.keepAliveIntervalMs);
+    const uint32_t interval = std::max(
+        kMinKeepAliveMs, std::min(info_.revisedSessionTimeoutMs / 3, options_.keepAliveIntervalMs));
     keepAliveTimer_.expires_after(std::chrono::milliseconds(interval));
     keepAliveTimer_.async_wait([weak = weak_from_this()](const asio::error_code& ec) {
         auto self = weak.lock();
