@@ -1,5 +1,7 @@
 #include "app/TestReadProgram.h"
 
+#include <algorithm>
+#include <cmath>
 #include <cstdlib>
 #include <iostream>
 
@@ -55,6 +57,19 @@ security::RunChoices RunChoicesOf(const TestReadOptions& options) {
     return choices;
 }
 
+// The user's wait for the server is also the one wait of each connection to
+// an OPC UA server; a call into a server may then take that long, and a
+// second more, so the connection's own diagnosis comes before the call limit.
+void ApplyWait(const TestReadOptions& options, uaopc::UaOptions& uaOptions,
+               platform::ServerCallWait& serverCalls) {
+    if (!options.timeoutSec) {
+        return;
+    }
+    const auto waitMs = static_cast<uint32_t>(std::lround(*options.timeoutSec * 1000));
+    uaOptions.session.channel.connectTimeoutMs = waitMs;
+    serverCalls.SetCallLimit(std::max(serverCalls.CallLimit(), waitMs + 1000));
+}
+
 // Standard output and error carry no control characters but line breaks and
 // tabs, whatever a server sent.
 int Run(const TestReadOptions& options, const std::vector<std::string>& arguments) {
@@ -86,6 +101,7 @@ int Run(const TestReadOptions& options, const std::vector<std::string>& argument
     posix::ConsolePasswordPrompt prompt(std::getenv(posix::ConsolePasswordPrompt::kVariable),
                                         std::cin);
     uaopc::UaOptions uaOptions;
+    ApplyWait(options, uaOptions, serverCalls);
     security::UaSecurity security(
         registry, pki,
         {uaOptions.session.applicationUri, uaOptions.session.applicationName,

@@ -8,6 +8,7 @@
 
 #include <gtest/gtest.h>
 
+#include <chrono>
 #include <cstdlib>
 #include <fstream>
 #include <regex>
@@ -183,6 +184,21 @@ TEST(TestReadProcess, ServerTextsReachTheTerminalWithoutControls) {
         EXPECT_NE(outcome.err.find(c.shown), std::string::npos) << outcome.err;
         EXPECT_FALSE(HasControls(outcome.err)) << outcome.err;
     }
+}
+
+// A server that never answers Hello: each attempt to connect waits what the
+// user gave (the item test makes three), not the 10 s a connection has by
+// default. The bound is generous, far below three default waits.
+TEST(TestReadProcess, TheUsersWaitBoundsEachConnection) {
+    using cv::ua::test::ScriptedServer;
+    ScriptedServer server([](ScriptedServer&, const ScriptedServer::Request& r) {
+        return r.kind == cv::ua::MessageKind::Hello;
+    });
+    const auto start = std::chrono::steady_clock::now();
+    const Outcome outcome =
+        RunProgram({"--test-read", server.Url(), "--item", "ns=1;s=X", "--timeout", "0.5"});
+    EXPECT_EQ(outcome.exitCode, 1) << outcome.err;
+    EXPECT_LT(std::chrono::steady_clock::now() - start, std::chrono::seconds(15));
 }
 
 TEST(TestReadProcess, UsageHelpVersionAndPlantFile) {

@@ -60,8 +60,14 @@ class ScriptedServer {
         response.header.requestHandle = request.requestHandle;
         SendChunk(MessageKind::Message, 'F', request.requestId, EncodeMessage(response));
     }
-    void SendChunk(MessageKind kind, char chunkType, uint32_t requestId, std::string_view body);
+    void SendChunk(MessageKind kind, char chunkType, uint32_t requestId, std::string_view body) {
+        SendRaw(Chunk(kind, chunkType, requestId, body));
+    }
+    // The bytes of a chunk, numbered in turn, for the script to send.
+    std::string Chunk(MessageKind kind, char chunkType, uint32_t requestId, std::string_view body);
     void SendRaw(std::string bytes);
+    // Sends the bytes one at a time, one each interval.
+    void Drip(std::string bytes, std::chrono::milliseconds interval);
     void SkipSequenceNumber() { ++sequence_; }
     void CloseConnection();
 

@@ -89,6 +89,7 @@ Result<std::unique_ptr<SecurityPolicy>> Session::MakePolicy() const {
 
 void Session::OpenChannel(const std::string& sEndpointUrl,
                           std::function<void(Result<Done>)> opened) {
+    connectDeadline_ = ConnectDeadline(options_.channel.connectTimeoutMs);
     auto policy = MakePolicy();
     if (!policy) {
         asio::post(io_, [opened = std::move(opened), error = policy.Failure()] { opened(error); });
@@ -126,7 +127,7 @@ void Session::CreateSession(std::function<void(Result<SessionInfo>)> done) {
     request.requestedSessionTimeout = options_.requestedSessionTimeoutMs;
     request.maxResponseMessageSize = options_.channel.limits.maxMessageSize;
     CallService<CreateSessionRequest, CreateSessionResponse>(
-        *channel_, std::move(request), options_.requestTimeoutMs,
+        *channel_, std::move(request), connectDeadline_.LeftMs(),
         [weak = weak_from_this(), done = std::move(done)](Result<CreateSessionResponse> created) {
             auto self = weak.lock();
             if (!self) {
@@ -234,7 +235,7 @@ void Session::ActivateSession(std::function<void(Result<SessionInfo>)> done) {
     }
     request.Value().header.requestHandle = ++lastRequestHandle_;
     CallService<ActivateSessionRequest, ActivateSessionResponse>(
-        *channel_, std::move(request.Value()), options_.requestTimeoutMs,
+        *channel_, std::move(request.Value()), connectDeadline_.LeftMs(),
         [weak = weak_from_this(), done = std::move(done)](Result<ActivateSessionResponse> active) {
             auto self = weak.lock();
             if (!self) {
