@@ -2,8 +2,9 @@
 // the path, the rest is a received byte stream (cut into frames, joined into
 // messages, decoded as every response the client knows) or one encoded
 // value. Checks that what decodes encodes to a form that decodes to the
-// same encoding again.
+// same encoding again, and that the reasons a server sends come out plain.
 
+#include <algorithm>
 #include <cstdint>
 #include <cstdlib>
 #include <string>
@@ -20,6 +21,7 @@
 #include "ua/services/SubscriptionServices.h"
 #include "ua/services/ViewServices.h"
 #include "ua/transport/TcpMessages.h"
+#include "ua/types/PlainText.h"
 
 namespace {
 
@@ -37,6 +39,15 @@ DecodeLimits Limits() {
     limits.maxArrayLength = 1u << 16;
     limits.maxAllocation = 64u << 20;
     return limits;
+}
+
+// Nothing of a plain text can steer a terminal, and making it plain again
+// changes nothing (so it is well-formed UTF-8, without C1 or bidi controls).
+void CheckPlain(std::string_view text) {
+    const std::string plain = PlainText(text);
+    Check(PlainText(plain) == plain);
+    Check(std::none_of(plain.begin(), plain.end(),
+                       [](char c) { return static_cast<unsigned char>(c) < 0x20 || c == 0x7F; }));
 }
 
 template <class T>
@@ -75,11 +86,18 @@ void Stream(std::string_view bytes) {
                 std::string_view(frame.Value()->bytes).substr(kFrameHeaderSize));
             RoundTrip<ErrorMessage>(
                 std::string_view(frame.Value()->bytes).substr(kFrameHeaderSize));
+            if (auto error = Decode<ErrorMessage>(
+                    std::string_view(frame.Value()->bytes).substr(kFrameHeaderSize), Limits())) {
+                CheckPlain(error.Value().reason);
+            }
             continue;
         }
         auto outcome = assembler.Add(std::move(*frame.Value()));
         if (!outcome) {
             return;
+        }
+        if (outcome.Value().aborted) {
+            CheckPlain(outcome.Value().aborted->error.text);
         }
         if (outcome.Value().message) {
             DecodeResponses<OpenSecureChannelResponse, GetEndpointsResponse, FindServersResponse,

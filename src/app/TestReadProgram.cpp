@@ -1,8 +1,11 @@
 #include "app/TestReadProgram.h"
 
+#include <algorithm>
+#include <cmath>
 #include <cstdlib>
 #include <iostream>
 
+#include "app/PlainOutput.h"
 #include "itemtest/CommandLineTestRead.h"
 #include "itemtest/TestReadCommandLine.h"
 #include "platform/Platform.h"
@@ -54,23 +57,42 @@ security::RunChoices RunChoicesOf(const TestReadOptions& options) {
     return choices;
 }
 
+// The user's wait for the server is also the one wait of each connection to
+// an OPC UA server; a call into a server may then take that long, and a
+// second more, so the connection's own diagnosis comes before the call limit.
+void ApplyWait(const TestReadOptions& options, uaopc::UaOptions& uaOptions,
+               platform::ServerCallWait& serverCalls) {
+    if (!options.timeoutSec) {
+        return;
+    }
+    const auto waitMs = static_cast<uint32_t>(std::lround(*options.timeoutSec * 1000));
+    uaOptions.session.channel.connectTimeoutMs = waitMs;
+    serverCalls.SetCallLimit(std::max(serverCalls.CallLimit(), waitMs + 1000));
+}
+
+// Standard output and error carry no control characters but line breaks and
+// tabs, whatever a server sent.
 int Run(const TestReadOptions& options, const std::vector<std::string>& arguments) {
+    PlainOutput plainOut(std::cout);
+    PlainOutput plainErr(std::cerr);
+    std::ostream out(&plainOut);
+    std::ostream err(&plainErr);
     const sim::PlantChoice choice = sim::ChoosePlant(
         sim::UserPlantFile(arguments, std::getenv(sim::kPlantEnvironmentVariable)));
     if (!choice.message.empty()) {
-        std::cerr << posix::ConsoleDialogs::PlainLines(choice.message) << '\n';
+        err << posix::ConsoleDialogs::PlainLines(choice.message) << '\n';
         return TestReadExit::kPlantUnusable;
     }
-    posix::ConsoleDialogs dialogs(std::cerr);
+    posix::ConsoleDialogs dialogs(err);
     posix::ConsoleLocale locale;
     posix::PosixProgramInfo program;
-    posix::ConsoleHelp help(std::cerr);
+    posix::ConsoleHelp help(err);
     posix::HostComputerName computer;
     posix::SteadyEventLoop events;
     posix::FileRegistry registry;
     posix::FileProfiles profiles;
     RunSwitches run;
-    posix::ConsoleBusyNotice busy(std::cerr);
+    posix::ConsoleBusyNotice busy(err);
     platform::ServerCallWait serverCalls(events, busy);
     sim::SimulatedPlant plant(choice.plant, serverCalls,
                               sim::PlantOptions{computer.Query().value_or(""), {}});
@@ -79,6 +101,7 @@ int Run(const TestReadOptions& options, const std::vector<std::string>& argument
     posix::ConsolePasswordPrompt prompt(std::getenv(posix::ConsolePasswordPrompt::kVariable),
                                         std::cin);
     uaopc::UaOptions uaOptions;
+    ApplyWait(options, uaOptions, serverCalls);
     security::UaSecurity security(
         registry, pki,
         {uaOptions.session.applicationUri, uaOptions.session.applicationName,
@@ -89,12 +112,12 @@ int Run(const TestReadOptions& options, const std::vector<std::string>& argument
     uaopc::UaBackend ua(serverCalls, uaOptions);
     platform::RoutingServerFactory servers(plant, ua);
     platform::TraceLog trace;
-    posix::ConsoleModeless modeless(std::cerr);
+    posix::ConsoleModeless modeless(err);
     Platform platform{
         dialogs,  locale, program, help,        computer, events,          registry,
         profiles, run,    servers, serverCalls, trace,    plant.NetEnum(), plant.DdeServers(),
         modeless};
-    return CommandLineTestRead(platform, options, std::cout, std::cerr).Run();
+    return CommandLineTestRead(platform, options, out, err).Run();
 }
 
 }  // namespace

@@ -4,6 +4,7 @@
 #include <ctime>
 
 #include "platform/AsciiCase.h"
+#include "ua/types/PlainText.h"
 
 namespace cv::security {
 namespace {
@@ -58,15 +59,18 @@ bool NamesHost(const ua::crypto::Certificate& certificate, const std::string& ho
 
 platform::CertificateFacts FactsOf(const ua::crypto::Certificate& certificate,
                                    const std::string& host) {
+    // The names come from the server: they are shown plain.
     platform::CertificateFacts facts;
-    facts.subject = certificate.Subject();
-    facts.applicationUri = certificate.ApplicationUri();
+    facts.subject = ua::PlainText(certificate.Subject());
+    facts.applicationUri = ua::PlainText(certificate.ApplicationUri());
     facts.thumbprint = ThumbprintText(certificate);
     facts.validFrom = TimeText(certificate.NotBefore());
     facts.validTo = TimeText(certificate.NotAfter());
     facts.host = host;
     facts.hostMatches = NamesHost(certificate, host);
-    facts.hostNames = certificate.DnsNames();
+    for (const std::string& name : certificate.DnsNames()) {
+        facts.hostNames.push_back(ua::PlainText(name));
+    }
     for (const std::string& address : certificate.IpAddresses()) {
         facts.hostNames.push_back(address);
     }

@@ -5,18 +5,39 @@
 #include "security/CertificateFacts.h"
 #include "ua/crypto/ChainCheck.h"
 #include "ua/transport/EndpointUrl.h"
+#include "ua/types/PlainText.h"
 
 namespace cv::security {
 
 using platform::CertificateProblem;
 using platform::PkiFolder;
 
+namespace {
+
+constexpr size_t kMaxNameBytes = 64;
+
+}  // namespace
+
 ServerTrust::ServerTrust(platform::PkiApi& pki) : pki_(pki) {}
 
+// The common name comes from the server. Plain (no control characters),
+// without separators, not hidden (a listing skips names that start with a
+// dot), and cut on a character boundary so the whole name stays far below
+// the 255 bytes a file name may have.
 std::string ServerTrust::FileName(const ua::crypto::Certificate& certificate) {
-    std::string name = certificate.CommonName();
+    std::string name = ua::PlainText(certificate.CommonName());
     std::replace_if(
-        name.begin(), name.end(), [](char c) { return c == '/' || c == '\\' || c == '\0'; }, '_');
+        name.begin(), name.end(), [](char c) { return c == '/' || c == '\\'; }, '_');
+    if (name.size() > kMaxNameBytes) {
+        size_t cut = kMaxNameBytes;
+        while ((static_cast<unsigned char>(name[cut]) & 0xC0) == 0x80) {
+            --cut;
+        }
+        name.resize(cut);
+    }
+    if (name.starts_with('.')) {
+        name.front() = '_';
+    }
     return (name.empty() ? "" : name + " ") + "[" + ThumbprintText(certificate) + "].der";
 }
 

@@ -8,6 +8,7 @@
 
 #include <gtest/gtest.h>
 
+#include <chrono>
 #include <cstdlib>
 #include <fstream>
 #include <regex>
@@ -16,6 +17,8 @@
 #include <vector>
 
 #include "support/TempFolder.h"
+#include "ua/ScriptedServer.h"
+#include "ua/services/MonitoredItemServices.h"
 
 extern char** environ;
 
@@ -126,6 +129,76 @@ TEST(TestReadProcess, FailuresPrintTheDiagnosisAndExitOne) {
         EXPECT_EQ(outcome.out, "");
         EXPECT_NE(outcome.err.find(c.diagnosis), std::string::npos) << outcome.err;
     }
+}
+
+// Standard error holds no control character but line breaks and tabs.
+bool HasControls(const std::string& text) {
+    for (size_t i = 0; i < text.size(); ++i) {
+        const auto byte = static_cast<unsigned char>(text[i]);
+        const bool c1 = byte == 0xC2 && i + 1 < text.size() &&
+                        (static_cast<unsigned char>(text[i + 1]) & 0xE0) == 0x80;
+        if ((byte < 0x20 && byte != '\n' && byte != '\t') || byte == 0x7F || c1) {
+            return true;
+        }
+    }
+    return false;
+}
+
+// Texts that would retitle the terminal, clear it and start a C1 escape (and
+// from the OPC UA server, draw a value line of its own): the reason an OPC UA
+// server gives for refusing to watch the item, and a plant's text value the
+// program quotes as no number.
+TEST(TestReadProcess, ServerTextsReachTheTerminalWithoutControls) {
+    const std::string reason =
+        "late\x1b]0;owned\x07\x1b[2J\n12:00:00.000\t42.5\t42.5\tgood\xc2\x9b"
+        "31m";
+    using cv::ua::test::ScriptedServer;
+    ScriptedServer server([&reason](ScriptedServer& s, const ScriptedServer::Request& r) {
+        if (r.typeId != cv::ua::CreateMonitoredItemsRequest::kEncodingId) {
+            return false;
+        }
+        s.SendChunk(
+            cv::ua::MessageKind::Message, 'A', r.requestId,
+            cv::ua::Encode(cv::ua::ErrorMessage{cv::ua::status::BadTcpInternalError, reason}));
+        return true;
+    });
+    const cv::test::TempFolder folder;
+    const std::string plant = folder.File("plant.json");
+    std::ofstream(plant) << R"({"computers": [{"name": "HERE", "local": true, "servers": ["S.1"]}],
+        "servers": [{"id": "S.1", "namespace": {"items": [{"name": "Text", "type": "BSTR",
+        "value": "late\u001b]0;owned\u0007\u001b[2J\u009b31m\u202e"}]}}]})";
+    const struct {
+        std::vector<std::string> arguments;
+        std::string shown;
+    } cases[] = {
+        {{"--test-read", server.Url(), "--item", "ns=1;s=X", "--security-mode", "None"},
+         "late]0;owned[2J 12:00:00.000 42.5 42.5 good31m"},
+        {{"--test-read", "S.1", "--item", "Text", "--plant", plant}, "late]0;owned[2J31m"},
+    };
+    for (const auto& c : cases) {
+        std::vector<std::string> arguments = c.arguments;
+        arguments.insert(arguments.end(), {"--timeout", "0.3"});
+        const Outcome outcome = RunProgram(arguments);
+        EXPECT_EQ(outcome.exitCode, 1);
+        EXPECT_EQ(outcome.out, "");
+        EXPECT_NE(outcome.err.find(c.shown), std::string::npos) << outcome.err;
+        EXPECT_FALSE(HasControls(outcome.err)) << outcome.err;
+    }
+}
+
+// A server that never answers Hello: each attempt to connect waits what the
+// user gave (the item test makes three), not the 10 s a connection has by
+// default. The bound is generous, far below three default waits.
+TEST(TestReadProcess, TheUsersWaitBoundsEachConnection) {
+    using cv::ua::test::ScriptedServer;
+    ScriptedServer server([](ScriptedServer&, const ScriptedServer::Request& r) {
+        return r.kind == cv::ua::MessageKind::Hello;
+    });
+    const auto start = std::chrono::steady_clock::now();
+    const Outcome outcome =
+        RunProgram({"--test-read", server.Url(), "--item", "ns=1;s=X", "--timeout", "0.5"});
+    EXPECT_EQ(outcome.exitCode, 1) << outcome.err;
+    EXPECT_LT(std::chrono::steady_clock::now() - start, std::chrono::seconds(15));
 }
 
 TEST(TestReadProcess, UsageHelpVersionAndPlantFile) {

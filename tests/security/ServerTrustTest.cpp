@@ -1,3 +1,5 @@
+#include <openssl/x509.h>
+
 #include <gtest/gtest.h>
 
 #include <filesystem>
@@ -7,6 +9,7 @@
 #include "security/ServerTrust.h"
 #include "support/TempFolder.h"
 #include "ua/support/TestCredentials.h"
+#include "ua/types/PlainText.h"
 
 namespace cv::security {
 namespace {
@@ -71,6 +74,62 @@ TEST_F(ServerTrustTest, TrustingAlwaysStoresItAndRejectingMovesIt) {
     ASSERT_FALSE(trust_.TrustAlways(server_.certificate));
     EXPECT_EQ(FilesIn("rejected/certs"), 0u);
     EXPECT_TRUE(ProblemsOf(server_.certificate).empty());
+}
+
+// The certificate with another common name, of any length and any bytes
+// (as a hostile server may send it), signed again with its own key.
+ua::crypto::Certificate WithCommonName(const ua::crypto::Credentials& made,
+                                       const std::string& commonName) {
+    X509* x509 = X509_dup(made.certificate.Get());
+    X509_NAME* name = X509_NAME_new();
+    X509_NAME_add_entry_by_NID(name, NID_commonName, V_ASN1_UTF8STRING,
+                               reinterpret_cast<const unsigned char*>(commonName.data()),
+                               static_cast<int>(commonName.size()), -1, 0);
+    X509_set_subject_name(x509, name);
+    X509_set_issuer_name(x509, name);
+    X509_NAME_free(name);
+    X509_sign(x509, made.key.Get(), EVP_sha256());
+    unsigned char* der = nullptr;
+    const int size = i2d_X509(x509, &der);
+    const std::string bytes(reinterpret_cast<char*>(der), static_cast<size_t>(size));
+    OPENSSL_free(der);
+    X509_free(x509);
+    return ua::crypto::Certificate::FromDer(bytes).Value();
+}
+
+TEST_F(ServerTrustTest, EveryCommonNameGivesAFileTheStoreFindsAgain) {
+    std::string accents = "x";
+    for (int i = 0; i < 200; ++i) {
+        accents += "\xc3\xa9";
+    }
+    const std::vector<std::pair<const char*, std::string>> names = {
+        {"hidden", ".Plant Server"},
+        {"parent folder", ".."},
+        {"climbing out", "../../evil"},
+        {"long", std::string(300, 'x')},
+        {"long, cut inside a character", accents},
+        {"controls and separators", "Plant\x1b[2J\nServer\\a/b"},
+    };
+    for (const auto& [what, commonName] : names) {
+        SCOPED_TRACE(what);
+        const ua::crypto::Certificate certificate = WithCommonName(server_, commonName);
+        ASSERT_EQ(certificate.CommonName(), commonName);
+        const std::string file = ServerTrust::FileName(certificate);
+        EXPECT_FALSE(file.starts_with('.')) << file;
+        EXPECT_LE(file.size(), 120u) << file;
+        EXPECT_EQ(file.find_first_of("/\\"), std::string::npos) << file;
+        EXPECT_EQ(ua::PlainText(file), file) << "controls or a character cut in two";
+        ASSERT_FALSE(trust_.TrustAlways(certificate));
+        EXPECT_TRUE(
+            ServerTrust(pki_).Examine(certificate, kUrl, ua::DateTime::Now()).problems.empty())
+            << "trusted always, yet asked again: " << file;
+        ASSERT_FALSE(trust_.Reject(certificate));
+        EXPECT_EQ(ServerTrust(pki_).Examine(certificate, kUrl, ua::DateTime::Now()).problems,
+                  Problems{CertificateProblem::Rejected})
+            << "rejected, yet not remembered: " << file;
+    }
+    EXPECT_EQ(FilesIn("trusted/certs"), 0u);
+    EXPECT_EQ(FilesIn("rejected/certs"), names.size());
 }
 
 TEST_F(ServerTrustTest, FindsEachProblemOfATrustedCertificate) {

@@ -264,5 +264,62 @@ TEST(ScriptedServerFaults, ConnectNamesAnUnusableAddress) {
     }
 }
 
+// A reason that would retitle the terminal, clear it, draw a value line of
+// its own and start a C1 escape, and how it must arrive.
+const std::string kHostileReason =
+    "overloaded\x1b]0;owned\x07\x1b[2J\n12:00:00.000\t42.5\t42.5\tgood\xc2\x9b"
+    "31m";
+const std::string kReasonArrives = "overloaded]0;owned[2J 12:00:00.000 42.5 42.5 good31m";
+
+bool HasControls(std::string_view text) {
+    for (size_t i = 0; i < text.size(); ++i) {
+        const auto byte = static_cast<unsigned char>(text[i]);
+        const bool c1 = byte == 0xC2 && i + 1 < text.size() &&
+                        (static_cast<unsigned char>(text[i + 1]) & 0xE0) == 0x80;
+        if (byte < 0x20 || byte == 0x7F || c1) {
+            return true;
+        }
+    }
+    return false;
+}
+
+TEST(ScriptedServerFaults, ReasonsFromTheServerArriveWithoutControlCharacters) {
+    const ErrorMessage hostile{status::BadTcpInternalError, kHostileReason};
+    const auto readFailure = [](std::function<void(ScriptedServer&, const Request&)> answer) {
+        Scripted scripted(OnFirstRead(std::move(answer)));
+        EXPECT_TRUE(scripted.Connect());
+        auto read = scripted.Read();
+        return read ? std::string("the Read worked") : read.Failure().text;
+    };
+    const auto shutdownReason = [] {
+        ClientOptions options = Scripted::Options();
+        options.keepAliveIntervalMs = 100;
+        Scripted scripted(OnFirstRead([](ScriptedServer& s, const Request& r) {
+                              ReadResponse state;
+                              state.results.resize(2);
+                              state.results[0].value = int32_t{4};
+                              state.results[1].value = LocalizedText{"en", kHostileReason};
+                              s.Reply(r, state);
+                          }),
+                          options);
+        EXPECT_TRUE(scripted.Connect());
+        return scripted.WaitForEvents(1) ? scripted.events_[0].second.text : "no event";
+    };
+    const std::vector<std::pair<const char*, std::string>> texts = {
+        {"abort chunk", readFailure([&](ScriptedServer& s, const Request& r) {
+             s.SendChunk(MessageKind::Message, 'A', r.requestId, Encode(hostile));
+         })},
+        {"ERR message", readFailure([&](ScriptedServer& s, const Request&) {
+             s.SendRaw(MakeFrame(MessageKind::Error, ChunkType::Final, Encode(hostile)));
+         })},
+        {"shutdown reason", shutdownReason()},
+    };
+    for (const auto& [name, text] : texts) {
+        SCOPED_TRACE(name);
+        EXPECT_FALSE(HasControls(text)) << text;
+        EXPECT_NE(text.find(kReasonArrives), std::string::npos) << text;
+    }
+}
+
 }  // namespace
 }  // namespace cv::ua::test

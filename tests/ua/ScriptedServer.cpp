@@ -2,6 +2,7 @@
 
 #include <algorithm>
 #include <asio/post.hpp>
+#include <asio/steady_timer.hpp>
 #include <asio/write.hpp>
 
 #include "ua/secure/NoneSecurityPolicy.h"
@@ -126,7 +127,7 @@ void ScriptedServer::Answer(const Request& request) {
             CreateSessionResponse response;
             response.sessionId = NodeId(1, 1u);
             response.authenticationToken = NodeId(1, std::string("token"));
-            response.revisedSessionTimeout = 60'000;
+            response.revisedSessionTimeout = sessionTimeoutMs;
             response.serverEndpoints = {NoneEndpoint(Url())};
             Reply(request, response);
             return;
@@ -166,8 +167,8 @@ void ScriptedServer::Answer(const Request& request) {
     }
 }
 
-void ScriptedServer::SendChunk(MessageKind kind, char chunkType, uint32_t requestId,
-                               std::string_view body) {
+std::string ScriptedServer::Chunk(MessageKind kind, char chunkType, uint32_t requestId,
+                                  std::string_view body) {
     std::string chunk(kFrameHeaderSize, '\0');
     Encoder encoder(chunk);
     encoder(kChannelId);
@@ -181,7 +182,7 @@ void ScriptedServer::SendChunk(MessageKind kind, char chunkType, uint32_t reques
     chunk.append(body);
     chunk.replace(0, 4, std::string(MessageKindCode(kind)) + chunkType);
     encoder.PatchUInt32(4, static_cast<uint32_t>(chunk.size()));
-    SendRaw(std::move(chunk));
+    return chunk;
 }
 
 void ScriptedServer::SendRaw(std::string bytes) {
@@ -189,6 +190,19 @@ void ScriptedServer::SendRaw(std::string bytes) {
         asio::error_code ignored;
         asio::write(*socket_, asio::buffer(bytes), ignored);
     }
+}
+
+void ScriptedServer::Drip(std::string bytes, std::chrono::milliseconds interval) {
+    if (bytes.empty()) {
+        return;
+    }
+    SendRaw(bytes.substr(0, 1));
+    auto timer = std::make_shared<asio::steady_timer>(io_, interval);
+    timer->async_wait([this, timer, rest = bytes.substr(1), interval](const asio::error_code& ec) {
+        if (!ec) {
+            Drip(rest, interval);
+        }
+    });
 }
 
 void ScriptedServer::CloseConnection() {

@@ -51,6 +51,8 @@ class ScriptedServer {
     // What the Acknowledge offers; set before the client connects.
     AcknowledgeMessage acknowledge{0, 65535, 65535, 0, 0};
     uint32_t tokenLifetimeMs = 600'000;
+    // The session time-out CreateSession answers.
+    double sessionTimeoutMs = 60'000;
 
     // For the script, on the server's thread.
     template <class Response>
@@ -58,8 +60,14 @@ class ScriptedServer {
         response.header.requestHandle = request.requestHandle;
         SendChunk(MessageKind::Message, 'F', request.requestId, EncodeMessage(response));
     }
-    void SendChunk(MessageKind kind, char chunkType, uint32_t requestId, std::string_view body);
+    void SendChunk(MessageKind kind, char chunkType, uint32_t requestId, std::string_view body) {
+        SendRaw(Chunk(kind, chunkType, requestId, body));
+    }
+    // The bytes of a chunk, numbered in turn, for the script to send.
+    std::string Chunk(MessageKind kind, char chunkType, uint32_t requestId, std::string_view body);
     void SendRaw(std::string bytes);
+    // Sends the bytes one at a time, one each interval.
+    void Drip(std::string bytes, std::chrono::milliseconds interval);
     void SkipSequenceNumber() { ++sequence_; }
     void CloseConnection();
 

@@ -20,6 +20,7 @@ PasswordDialog::PasswordDialog(const platform::PasswordRequest& request, QWidget
     }
     auto* label = new QLabel(text);
     label->setObjectName("lblPrompt");
+    label->setTextFormat(Qt::PlainText);
     label->setWordWrap(true);
     password_->setObjectName("txtPassword");
     password_->setEchoMode(QLineEdit::Password);

@@ -17,6 +17,8 @@ QString Text(const std::string& text) {
 QLabel* Fact(const char* name, const QString& text) {
     auto* label = new QLabel(text);
     label->setObjectName(name);
+    // Certificate fields come from the server: never rich text.
+    label->setTextFormat(Qt::PlainText);
     label->setTextInteractionFlags(Qt::TextSelectableByMouse);
     return label;
 }

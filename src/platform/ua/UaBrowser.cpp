@@ -6,6 +6,7 @@
 #include "platform/opc/OpcResult.h"
 #include "platform/ua/UaStatusMap.h"
 #include "ua/types/NodeIdText.h"
+#include "ua/types/PlainText.h"
 
 namespace cv::uaopc {
 
@@ -131,8 +132,8 @@ ErrorInfo UaBrowser::Children(State& state) {
             node.namespaceIndex = static_cast<uint16_t>(index - namespaces.begin());
         }
         const std::string& display = reference.displayName.text;
-        children.push_back({display.empty() ? reference.browseName.name : display, node,
-                            reference.nodeClass == ua::NodeClass::Object});
+        children.push_back({ua::PlainText(display.empty() ? reference.browseName.name : display),
+                            node, reference.nodeClass == ua::NodeClass::Object});
     }
     // Objects are branches when they have children other than properties.
     std::vector<bool> keep(children.size(), true);

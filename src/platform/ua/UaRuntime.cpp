@@ -2,6 +2,7 @@
 
 #include "platform/ua/UaAwait.h"
 #include "ua/transport/EndpointUrl.h"
+#include "ua/types/PlainText.h"
 
 namespace cv::uaopc {
 
@@ -77,7 +78,7 @@ std::vector<FoundServer> UaRuntime::FindServers(const std::string& node) {
     for (const ua::ApplicationDescription& server : answer->Value()) {
         const std::string address = AddressOf(server, host);
         if (server.applicationType != ua::ApplicationType::DiscoveryServer && !address.empty()) {
-            found.push_back({server.applicationName.text, address});
+            found.push_back({ua::PlainText(server.applicationName.text), address});
         }
     }
     return found;

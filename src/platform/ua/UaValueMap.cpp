@@ -2,6 +2,7 @@
 
 #include "platform/ua/UaTime.h"
 #include "ua/types/NodeIdText.h"
+#include "ua/types/PlainText.h"
 
 namespace cv::uaopc {
 
@@ -53,8 +54,10 @@ struct ScalarOf {
     }
 };
 
+// Texts come from the server: they are shown plain, on one line.
 Variant Scalar(const ua::Variant& value) {
-    return std::visit(ScalarOf{}, value.Value());
+    Variant scalar = std::visit(ScalarOf{}, value.Value());
+    return scalar.VarType() == VT_BSTR ? Variant::Str(ua::PlainText(scalar.AsStr())) : scalar;
 }
 
 // The UA type FromAutomation gives elements of this automation type.

@@ -2,6 +2,7 @@
 
 #include <asio/post.hpp>
 
+#include "ua/client/ConnectDeadline.h"
 #include "ua/secure/NoneSecurityPolicy.h"
 #include "ua/types/VariantConversion.h"
 
@@ -100,14 +101,16 @@ void ClientCore::Discover(const std::string& sUrl, Request request,
             self->Reply(done, std::move(answer));
         }
     };
+    // One wait for the channel and the request together.
+    const ConnectDeadline deadline(options_.channel.connectTimeoutMs);
     channel->Open(sUrl, [channel, request = std::move(request), results, finish,
-                         timeout = options_.requestTimeoutMs](Result<Done> opened) mutable {
+                         deadline](Result<Done> opened) mutable {
         if (!opened) {
             finish(opened.Failure());
             return;
         }
         request.header.requestHandle = 1;
-        CallService<Request, Response>(*channel, std::move(request), timeout,
+        CallService<Request, Response>(*channel, std::move(request), deadline.LeftMs(),
                                        [results, finish](Result<Response> response) {
                                            if (!response) {
                                                finish(response.Failure());

@@ -17,6 +17,10 @@ struct ClientOptions {
     std::string applicationUri = "urn:cvopctestclient:client";
     std::string applicationName = "Corvalent OPC Test Client";
     std::string sessionName = "cvopctestclient";
+    // channel.connectTimeoutMs is the one wait for a whole connection, however
+    // the server paces its bytes: connecting, Hello and OpenSecureChannel,
+    // then CreateSession and ActivateSession (or a discovery request). Each
+    // attempt to resume a session has the same wait.
     ChannelOptions channel;
     // Every service request; Publish waits longer (see SubscriptionEngine).
     uint32_t requestTimeoutMs = 10'000;

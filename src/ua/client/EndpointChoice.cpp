@@ -5,6 +5,7 @@
 
 #include "ua/secure/NoneSecurityPolicy.h"
 #include "ua/secure/PolicyProfile.h"
+#include "ua/types/PlainText.h"
 
 namespace cv::ua {
 namespace {
@@ -64,7 +65,7 @@ std::string Offered(const std::vector<EndpointDescription>& endpoints) {
 
 std::string PolicyName(const std::string& policyUri) {
     const size_t hash = policyUri.rfind('#');
-    return hash == std::string::npos ? policyUri : policyUri.substr(hash + 1);
+    return PlainText(hash == std::string::npos ? policyUri : policyUri.substr(hash + 1));
 }
 
 std::string ModeName(MessageSecurityMode mode) {

@@ -9,6 +9,7 @@
 #include "ua/secure/NoneSecurityPolicy.h"
 #include "ua/secure/SessionSignature.h"
 #include "ua/services/ViewServices.h"
+#include "ua/types/PlainText.h"
 
 namespace cv::ua {
 namespace {
@@ -16,10 +17,22 @@ namespace {
 constexpr size_t kNonceSize = 32;
 constexpr int32_t kServerStateShutdown = 4;
 constexpr uint32_t kMinKeepAliveMs = 100;
+constexpr double kMinSessionTimeoutMs = 1'000;
+constexpr double kMaxSessionTimeoutMs = 3'600'000;
 
 bool IsBinary(const EndpointDescription& endpoint) {
     return endpoint.transportProfileUri.empty() ||
            endpoint.transportProfileUri.ends_with("uatcp-uasc-uabinary");
+}
+
+// The session time-out paces the keep-alive reads (a third of it) and bounds
+// how long a broken connection is resumed. Below a second the reads would
+// flood the server; past an hour the program would go on resuming a session
+// the server has long forgotten (a hostile 1e12 would mean years). A value
+// that is no positive number (NaN, 0, negative) leaves what was asked for.
+uint32_t UsableSessionTimeout(double revisedMs, uint32_t requestedMs) {
+    const double ms = revisedMs > 0 ? revisedMs : requestedMs;
+    return static_cast<uint32_t>(std::clamp(ms, kMinSessionTimeoutMs, kMaxSessionTimeoutMs));
 }
 
 }  // namespace
@@ -80,6 +93,7 @@ Result<std::unique_ptr<SecurityPolicy>> Session::MakePolicy() const {
 
 void Session::OpenChannel(const std::string& sEndpointUrl,
                           std::function<void(Result<Done>)> opened) {
+    connectDeadline_ = ConnectDeadline(options_.channel.connectTimeoutMs);
     auto policy = MakePolicy();
     if (!policy) {
         asio::post(io_, [opened = std::move(opened), error = policy.Failure()] { opened(error); });
@@ -117,7 +131,7 @@ void Session::CreateSession(std::function<void(Result<SessionInfo>)> done) {
     request.requestedSessionTimeout = options_.requestedSessionTimeoutMs;
     request.maxResponseMessageSize = options_.channel.limits.maxMessageSize;
     CallService<CreateSessionRequest, CreateSessionResponse>(
-        *channel_, std::move(request), options_.requestTimeoutMs,
+        *channel_, std::move(request), connectDeadline_.LeftMs(),
         [weak = weak_from_this(), done = std::move(done)](Result<CreateSessionResponse> created) {
             auto self = weak.lock();
             if (!self) {
@@ -229,7 +243,8 @@ Result<Done> Session::OnCreated(const CreateSessionResponse& created) {
     authenticationToken_ = created.authenticationToken;
     serverNonce_ = created.serverNonce;
     info_.sessionId = created.sessionId;
-    info_.revisedSessionTimeoutMs = created.revisedSessionTimeout;
+    info_.revisedSessionTimeoutMs =
+        UsableSessionTimeout(created.revisedSessionTimeout, options_.requestedSessionTimeoutMs);
     info_.endpoint = std::move(endpoint.Value());
     return Done{};
 }
@@ -264,7 +279,7 @@ void Session::ActivateSession(std::function<void(Result<SessionInfo>)> done) {
     }
     request.Value().header.requestHandle = ++lastRequestHandle_;
     CallService<ActivateSessionRequest, ActivateSessionResponse>(
-        *channel_, std::move(request.Value()), options_.requestTimeoutMs,
+        *channel_, std::move(request.Value()), connectDeadline_.LeftMs(),
         [weak = weak_from_this(), done = std::move(done)](Result<ActivateSessionResponse> active) {
             auto self = weak.lock();
             if (!self) {
@@ -283,10 +298,8 @@ void Session::ActivateSession(std::function<void(Result<SessionInfo>)> done) {
 }
 
 void Session::StartKeepAlive() {
-    const auto third = static_cast<uint32_t>(info_.revisedSessionTimeoutMs / 3);
-    const uint32_t interval =
-        std::max(kMinKeepAliveMs, third ? std::min(third, options_.keepAliveIntervalMs)
-                                        : options_.keepAliveIntervalMs);
+    const uint32_t interval = std::max(
+        kMinKeepAliveMs, std::min(info_.revisedSessionTimeoutMs / 3, options_.keepAliveIntervalMs));
     keepAliveTimer_.expires_after(std::chrono::milliseconds(interval));
     keepAliveTimer_.async_wait([weak = weak_from_this()](const asio::error_code& ec) {
         auto self = weak.lock();
@@ -319,7 +332,7 @@ void Session::OnKeepAlive(Result<ReadResponse> response) {
             if (events_) {
                 events_(ConnectionEvent::ServerShutdown,
                         Error{status::BadShutdown, reason && !reason->text.empty()
-                                                       ? reason->text
+                                                       ? PlainText(reason->text)
                                                        : "The server is shutting down."});
             }
         }

@@ -11,6 +11,7 @@
 #include <string_view>
 
 #include "ua/client/ClientOptions.h"
+#include "ua/client/ConnectDeadline.h"
 #include "ua/client/ConnectOptions.h"
 #include "ua/client/ServiceCall.h"
 #include "ua/client/SessionInfo.h"
@@ -81,6 +82,8 @@ class Session : public std::enable_shared_from_this<Session> {
     };
 
     Result<std::unique_ptr<SecurityPolicy>> MakePolicy() const;
+    // Opens a channel and starts the one wait that covers it and the
+    // session services after it (connectDeadline_).
     void OpenChannel(const std::string& sEndpointUrl, std::function<void(Result<Done>)> opened);
     void CreateSession(std::function<void(Result<SessionInfo>)> done);
     Result<Done> OnCreated(const CreateSessionResponse& created);
@@ -152,6 +155,7 @@ class Session : public std::enable_shared_from_this<Session> {
     bool active_ = false;
     bool shutdownAnnounced_ = false;
     SessionInfo info_;
+    ConnectDeadline connectDeadline_;
     // Resuming after a broken channel.
     bool resuming_ = false;
     Error lostReason_;

@@ -1,5 +1,6 @@
 #pragma once
 
+#include <cstdint>
 #include <string>
 
 #include "ua/services/DiscoveryServices.h"
@@ -10,7 +11,8 @@ namespace cv::ua {
 struct SessionInfo {
     std::string endpointUrl;
     NodeId sessionId;
-    double revisedSessionTimeoutMs = 0;
+    // The server's revised session time-out, kept within 1 s and 1 hour.
+    uint32_t revisedSessionTimeoutMs = 0;
     // The endpoint the session uses, as the server describes it.
     EndpointDescription endpoint;
 };

@@ -11,9 +11,8 @@ namespace {
 // last pause repeats until the session time-out has passed.
 constexpr std::array<uint32_t, 5> kResumePausesMs = {500, 1000, 2000, 4000, 5000};
 
-std::string Duration(double ms) {
-    const auto whole = static_cast<int64_t>(ms);
-    return whole % 1000 == 0 ? std::to_string(whole / 1000) + " s" : std::to_string(whole) + " ms";
+std::string Duration(uint32_t ms) {
+    return ms % 1000 == 0 ? std::to_string(ms / 1000) + " s" : std::to_string(ms) + " ms";
 }
 
 }  // namespace
@@ -28,8 +27,7 @@ void Session::StartResume(const Error& reason) {
     lostReason_ = reason;
     resumeAttempts_ = 0;
     resumeDeadline_ =
-        std::chrono::steady_clock::now() +
-        std::chrono::milliseconds(static_cast<int64_t>(info_.revisedSessionTimeoutMs));
+        std::chrono::steady_clock::now() + std::chrono::milliseconds(info_.revisedSessionTimeoutMs);
     if (events_) {
         events_(ConnectionEvent::Interrupted, reason);
     }

@@ -8,6 +8,7 @@
 #include "ua/secure/ChunkPadding.h"
 #include "ua/secure/SymmetricChunk.h"
 #include "ua/transport/TcpMessages.h"
+#include "ua/types/PlainText.h"
 
 namespace cv::ua {
 namespace {
@@ -120,8 +121,8 @@ Result<Done> CryptoSecurityPolicy::ReadAsymmetricHeader(Decoder& decoder) const 
     }
     if (uri != profile_.uri) {
         return Error{status::BadSecurityPolicyRejected,
-                     "The server answered with the security policy \"" + uri + "\" instead of " +
-                         std::string(profile_.name) + "."};
+                     "The server answered with the security policy \"" + PlainText(uri) +
+                         "\" instead of " + std::string(profile_.name) + "."};
     }
     if (!std::string_view(certificate.bytes).starts_with(server_.LeafDer())) {
         return Error{status::BadCertificateInvalid,

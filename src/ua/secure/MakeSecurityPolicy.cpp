@@ -2,6 +2,7 @@
 
 #include "ua/secure/CryptoSecurityPolicy.h"
 #include "ua/secure/NoneSecurityPolicy.h"
+#include "ua/types/PlainText.h"
 
 namespace cv::ua {
 
@@ -10,7 +11,7 @@ Result<std::unique_ptr<SecurityPolicy>> MakeSecurityPolicy(const EndpointDescrip
     const bool none = endpoint.securityPolicyUri == NoneSecurityPolicy::kUri;
     if (none != (endpoint.securityMode == MessageSecurityMode::None)) {
         return Error{status::BadSecurityModeRejected, "The endpoint pairs the security policy \"" +
-                                                          endpoint.securityPolicyUri +
+                                                          PlainText(endpoint.securityPolicyUri) +
                                                           "\" with a mode that does not fit it."};
     }
     if (none) {
@@ -20,7 +21,7 @@ Result<std::unique_ptr<SecurityPolicy>> MakeSecurityPolicy(const EndpointDescrip
     if (!profile) {
         return Error{status::BadSecurityPolicyRejected,
                      "The program does not know the security policy \"" +
-                         endpoint.securityPolicyUri + "\"."};
+                         PlainText(endpoint.securityPolicyUri) + "\"."};
     }
     if (!own) {
         return Error{status::BadCertificateInvalid,

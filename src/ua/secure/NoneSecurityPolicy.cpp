@@ -2,6 +2,7 @@
 
 #include "ua/encoding/Decoder.h"
 #include "ua/encoding/Encoder.h"
+#include "ua/types/PlainText.h"
 
 namespace cv::ua {
 
@@ -22,9 +23,9 @@ Result<Done> NoneSecurityPolicy::ReadAsymmetricHeader(Decoder& decoder) const {
         return decoder.Failure();
     }
     if (uri != kUri) {
-        return Error{
-            status::BadSecurityChecksFailed,
-            "The server answered with the security policy \"" + uri + "\" instead of None."};
+        return Error{status::BadSecurityChecksFailed,
+                     "The server answered with the security policy \"" + PlainText(uri) +
+                         "\" instead of None."};
     }
     return Done{};
 }

@@ -8,6 +8,7 @@
 
 #include "ua/services/ChannelServices.h"
 #include "ua/services/ServiceMessages.h"
+#include "ua/types/PlainText.h"
 #include "ua/types/StatusCodeTable.h"
 
 namespace cv::ua {
@@ -154,7 +155,8 @@ void SecureChannel::OnFrame(Frame frame) {
             const StatusCode code =
                 error.error.code != 0 ? error.error : status::BadUnexpectedError;
             Fail(Error{code, "The server ended the connection: " +
-                                 (error.reason.empty() ? DescribeStatusCode(code) : error.reason)});
+                                 (error.reason.empty() ? DescribeStatusCode(code)
+                                                       : PlainText(error.reason))});
             return;
         }
         case MessageKind::Hello:
@@ -183,7 +185,7 @@ void SecureChannel::OnFrame(Frame frame) {
         if (found != pending_.end()) {
             Completion done = std::move(found->second.done);
             pending_.erase(found);
-            done(aborted.error);
+            done(Error{aborted.error.status, PlainText(aborted.error.text)});
         }
     }
     if (outcome.Value().message) {

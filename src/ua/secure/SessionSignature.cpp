@@ -1,6 +1,7 @@
 #include "ua/secure/SessionSignature.h"
 
 #include "ua/secure/PolicyProfile.h"
+#include "ua/types/PlainText.h"
 
 namespace cv::ua {
 
@@ -17,7 +18,7 @@ Result<Done> CheckSessionSignature(const crypto::Certificate& signer, std::strin
                                    std::string_view nonce, const SignatureData& signature) {
     if (signature.algorithm != kRsaSha256Uri) {
         return Error{status::BadApplicationSignatureInvalid,
-                     "The server signed the session with \"" + signature.algorithm +
+                     "The server signed the session with \"" + PlainText(signature.algorithm) +
                          "\" instead of RSA-SHA256."};
     }
     if (!signer.VerifySha256(std::string(certificate) + std::string(nonce),

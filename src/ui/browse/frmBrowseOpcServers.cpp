@@ -69,6 +69,7 @@ void frmBrowseOpcServers::CreateControls() {
     fraSelected = Named(new QGroupBox(QStringLiteral("Selected Server")), "fraSelected");
     lblSelected = Named(new QLabel(QStringLiteral("\\\\Node\\Server :")), "lblSelected");
     lblServerID = Named(new QLabel(), "lblServerID");
+    lblServerID->setTextFormat(Qt::PlainText);  // names discovery found
     lblServerID->setTextInteractionFlags(Qt::TextSelectableByMouse);
     auto* selected = new QHBoxLayout(fraSelected);
     selected->addWidget(lblSelected);

@@ -93,6 +93,7 @@ QGroupBox* frmOpcBrowse::CreateSelectedFrame() {
     Frame1 = Named(new QGroupBox(QStringLiteral("Selected Item")), "Frame1");
     Label2 = Named(new QLabel(QStringLiteral("Name :")), "Label2");
     lblItemID = Named(new QLabel(), "lblItemID");
+    lblItemID->setTextFormat(Qt::PlainText);  // the server's node id
     lblItemID->setTextInteractionFlags(Qt::TextSelectableByMouse);
     lblAccessPath = Named(new QLabel(QStringLiteral("Access Paths :")), "lblAccessPath");
     cmbAccessPaths = Named(new QComboBox(), "cmbAccessPaths");

@@ -31,8 +31,11 @@ Widget* Named(Widget* widget, const char* name) {
     return widget;
 }
 
+// Values and names come from the server: labels never show rich text.
 QLabel* NewLabel(const char* name, const char* caption = "") {
-    return Named(new QLabel(QString::fromUtf8(caption)), name);
+    auto* label = Named(new QLabel(QString::fromUtf8(caption)), name);
+    label->setTextFormat(Qt::PlainText);
+    return label;
 }
 
 QString Text(const std::string& text) {

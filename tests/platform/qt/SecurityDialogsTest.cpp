@@ -64,6 +64,18 @@ class SecurityDialogsTest : public QObject {
         QCOMPARE(LabelText(matching, "lblHost"), QString("Yes: it names plant"));
     }
 
+    void trustDialogShowsTheServersTextsAsTheyAre() {
+        TrustQuestion question = Question(true);
+        question.facts.subject = "<b>CN=Plant</b><img src=\"x\">";
+        question.facts.applicationUri = "<a href=\"x\">urn:test:peer</a>";
+        cv::qtui::TrustDialog dialog(question);
+        for (const char* name : {"lblEndpoint", "lblSubject", "lblApplicationUri", "lblThumbprint",
+                                 "lblValidity", "lblHost", "lblDiagnosis"}) {
+            QCOMPARE(dialog.findChild<QLabel*>(name)->textFormat(), Qt::PlainText);
+        }
+        QCOMPARE(LabelText(dialog, "lblSubject"), QString("<b>CN=Plant</b><img src=\"x\">"));
+    }
+
     void eachButtonGivesItsAnswer() {
         struct Row {
             const char* button;  // null: the window is closed with Escape
