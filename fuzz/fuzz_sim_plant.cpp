@@ -18,6 +18,7 @@ namespace {
 
 using namespace cv;
 using platform::OneBased;
+using platform::ValueDetail;
 
 void Check(bool bCondition) {
     if (!bCondition) {
@@ -68,8 +69,9 @@ void Exercise(sim::SimulatedPlant& plant, fake::VirtualEventLoop& events,
     OneBased<Variant> values;
     OneBased<int32_t> qualities;
     OneBased<double> stamps;
-    if (!group->SyncRead(2, serverHandles.Count(), serverHandles, values, errors, qualities,
-                         stamps)) {
+    OneBased<ValueDetail> details;
+    if (!group->SyncRead(2, serverHandles.Count(), serverHandles, values, errors, qualities, stamps,
+                         details)) {
         Check(values.Count() == serverHandles.Count());
     }
 }

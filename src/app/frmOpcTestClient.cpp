@@ -193,6 +193,13 @@ void frmOpcTestClient::WatchFields() {
                                             txtInstMin,    txtInstMax,    txtSI};
     for (QWidget* field : fields) {
         field->installEventFilter(this);
+        if (auto* box = qobject_cast<QLineEdit*>(field)) {
+            connect(box, &QLineEdit::textEdited, this, [this, field] {
+                if (!mEditedFields.contains(field)) {
+                    mEditedFields.append(field);
+                }
+            });
+        }
     }
 }
 
@@ -230,7 +237,7 @@ void frmOpcTestClient::FillFields() {
 }
 
 void frmOpcTestClient::chkUseScaling_Click() {
-    if (!RunPendingValidations()) {
+    if (!ChecksPassed()) {
         // The click came with a focus move that was refused: it never happened.
         chkUseScaling->setChecked(!chkUseScaling->isChecked());
         return;
@@ -244,7 +251,7 @@ void frmOpcTestClient::chkUseScaling_Click() {
 // Buttons act only once the field the focus came from has passed its check
 // (the check may still be waiting when press and release arrive together).
 void frmOpcTestClient::cmdBrowseServers_Click() {
-    if (!RunPendingValidations()) {
+    if (!ChecksPassed()) {
         return;
     }
     std::string sServer = TestChannel().OpcNodeAndServer();
@@ -257,7 +264,7 @@ void frmOpcTestClient::cmdBrowseServers_Click() {
 // The test window opens where the copyright notice is, so that it covers the
 // lower part of this window and leaves the item's address in sight.
 void frmOpcTestClient::cmdTest_Click() {
-    if (!RunPendingValidations()) {
+    if (!ChecksPassed()) {
         return;
     }
     TestChannel().SetDescription(TestChannel().ItemName());
@@ -268,7 +275,7 @@ void frmOpcTestClient::cmdTest_Click() {
 }
 
 void frmOpcTestClient::cmdBrowseItems_Click() {
-    if (!RunPendingValidations()) {
+    if (!ChecksPassed()) {
         return;
     }
     std::string sItemID = txtItemID->text().toStdString();

@@ -3,6 +3,7 @@
 #include <deque>
 #include <string>
 
+#include <QList>
 #include <QPointer>
 #include <QWidget>
 
@@ -44,6 +45,7 @@ class frmOpcTestClient : public QWidget {
 
   protected:
     bool eventFilter(QObject* watched, QEvent* event) override;
+    void changeEvent(QEvent* event) override;
     void closeEvent(QCloseEvent* event) override;
 
   private:
@@ -70,6 +72,10 @@ class frmOpcTestClient : public QWidget {
     // Field checks (frmOpcTestClient_validate.cpp).
     void QueueValidation(QWidget* field);
     bool RunPendingValidations();
+    // Before the channel or the settings are used: every field typed in and
+    // not yet passed is checked too, the refused one first.
+    bool ChecksPassed();
+    void KeepFocusInRefusedField();
     bool Validate(QWidget* field);
     bool ValidateRangeBox(QLineEdit& box, const std::string& sSpanName, RangeType eRange,
                           bool bIsMax, double dOtherLimit);
@@ -95,6 +101,11 @@ class frmOpcTestClient : public QWidget {
     // message, no other check starts.
     std::deque<QPointer<QWidget>> mPendingValidations;
     bool mbValidating = false;
+    // Fields typed in (or rewritten by a refusal) whose text has not passed
+    // its check since, and the field refused last: it keeps the focus until
+    // it passes.
+    QList<QWidget*> mEditedFields;
+    QPointer<QWidget> mRefusedField;
 
     QGroupBox* Frame1 = nullptr;
     QLabel* Label1 = nullptr;

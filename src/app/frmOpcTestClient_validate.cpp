@@ -1,3 +1,4 @@
+#include <algorithm>
 #include <cmath>
 
 #include <QCheckBox>
@@ -47,7 +48,27 @@ bool frmOpcTestClient::eventFilter(QObject* watched, QEvent* event) {
         ChecksField(static_cast<QFocusEvent*>(event)->reason())) {
         QueueValidation(qobject_cast<QWidget*>(watched));
     }
+    // However the focus came to another field (the window system hands it
+    // back where it was going when a message box closes), a refused field
+    // keeps it.
+    if (event->type() == QEvent::FocusIn && mRefusedField && watched != mRefusedField) {
+        QMetaObject::invokeMethod(
+            this, [this] { KeepFocusInRefusedField(); }, Qt::QueuedConnection);
+    }
     return QWidget::eventFilter(watched, event);
+}
+
+void frmOpcTestClient::changeEvent(QEvent* event) {
+    if (event->type() == QEvent::ActivationChange && isActiveWindow()) {
+        KeepFocusInRefusedField();
+    }
+    QWidget::changeEvent(event);
+}
+
+void frmOpcTestClient::KeepFocusInRefusedField() {
+    if (mRefusedField && !mbValidating && !mRefusedField->hasFocus()) {
+        mRefusedField->setFocus(Qt::OtherFocusReason);
+    }
 }
 
 void frmOpcTestClient::QueueValidation(QWidget* field) {
@@ -69,15 +90,43 @@ bool frmOpcTestClient::RunPendingValidations() {
     while (bPassed && !mPendingValidations.empty()) {
         const QPointer<QWidget> field = mPendingValidations.front();
         mPendingValidations.pop_front();
-        if (field && !Validate(field)) {
-            // The focus goes back to the field; later moves never happened.
-            mPendingValidations.clear();
-            field->setFocus(Qt::OtherFocusReason);
-            bPassed = false;
+        if (!field) {
+            continue;
         }
+        if (Validate(field)) {
+            mEditedFields.removeAll(field);
+            if (field == mRefusedField) {
+                mRefusedField = nullptr;
+            }
+            continue;
+        }
+        // The field shows what was read from it, which the channel does not
+        // hold: it keeps the focus, and is checked again before any use.
+        // Later moves never happened.
+        mPendingValidations.clear();
+        mRefusedField = field;
+        if (!mEditedFields.contains(field)) {
+            mEditedFields.prepend(field);
+        }
+        field->setFocus(Qt::OtherFocusReason);
+        bPassed = false;
     }
     mbValidating = false;
     return bPassed;
+}
+
+bool frmOpcTestClient::ChecksPassed() {
+    if (mRefusedField) {
+        mEditedFields.removeAll(mRefusedField.data());
+        mEditedFields.prepend(mRefusedField.data());
+    }
+    for (QWidget* field : mEditedFields) {
+        if (std::find(mPendingValidations.begin(), mPendingValidations.end(), field) ==
+            mPendingValidations.end()) {
+            mPendingValidations.emplace_back(field);
+        }
+    }
+    return RunPendingValidations();
 }
 
 void frmOpcTestClient::closeEvent(QCloseEvent* event) {

@@ -5,8 +5,10 @@
 #include <string>
 #include <utility>
 
+#include "channel/OpcSample.h"
 #include "platform/ErrorInfo.h"
 #include "platform/Variant.h"
+#include "platform/opc/ValueDetail.h"
 
 namespace cv {
 
@@ -171,15 +173,19 @@ class Channel {
     void SetDdeLabel(std::shared_ptr<platform::DdeLink> cLabel);
     // Returns the stored error text and clears it.
     std::string ErrorStr();
+    // The failure last reported by the communications life cycle (shown, or
+    // left in the error text when silent).
+    const ErrorInfo& CommsError() const { return mCommsError; }
     int32_t SendResult() const { return miSendResult; }
     void SetSendResult(int32_t lResult) { miSendResult = lResult; }
     // The value as received: 0 while not online; may ask the uncertain-value
     // question once per channel.
     Variant RawValue();
 
-    // OPC members used by the OPC client.
+    // OPC members used by the OPC client. detail is what the server told
+    // besides the time stamp and the quality.
     void OpcSetRawValue(const Variant& vValue, int32_t lQuality, double dTimeStamp,
-                        bool bSingleShot);
+                        bool bSingleShot, const platform::ValueDetail& detail = {});
     void OpcDataChange(const std::string& sText);
     // The client marks the channels it served when their server shut down
     // (and says so itself); the mark lasts until CreateCommsObjects.
@@ -199,6 +205,7 @@ class Channel {
     double OpcTimeStamp() const;
     // The OPC quality word of the last value, without the channel's own marks.
     int32_t OpcQuality() const { return mlQuality & 0xF7FF; }
+    const OpcSample& LastOpcSample() const { return mOpcSample; }
 
     // The plain-words diagnosis of sOverride, or of currentError when
     // sOverride is empty. A DDE time-out sets lButtons to Yes/No and asks
@@ -228,7 +235,6 @@ class Channel {
     void WriteArchiveOpcAddress(IniFile& cIni);
     void CalcScaleFactors();
     void UpdateScalingFlags(TunFile& cTunFile);
-    ErrorInfo ScaledRawValue(const Variant& vRaw, double& dValue) const;
     void ProveNumber();
     void AskUncertainWarning();
     std::string QualityText(int32_t lQuality) const;
@@ -280,6 +286,8 @@ class Channel {
     Variant mvRawValue = Variant::Null();
     double mdTimeStamp = 0;
     int32_t mlQuality = 0;
+    OpcSample mOpcSample;
+    ErrorInfo mCommsError;
 };
 
 }  // namespace cv

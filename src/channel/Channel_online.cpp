@@ -149,6 +149,7 @@ bool Channel::SingleShotRead(TunFile& cTunFile, bool bSilent) {
 // error text when silent. Answers the button pressed (OK when silent).
 int32_t Channel::ReportCommsError(const ErrorInfo& error, int32_t lButtons, std::string& sText,
                                   bool bSilent) {
+    mCommsError = error;
     int32_t lExtraButtons = 0;
     std::string sQuestion;
     std::string sMessage = GetErrorString("", lExtraButtons, sQuestion, error);

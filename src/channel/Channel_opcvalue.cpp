@@ -28,7 +28,7 @@ std::string Channel::VariantText(const Variant& vValue) const {
 }
 
 void Channel::OpcSetRawValue(const Variant& vValue, int32_t lQuality, double dTimeStamp,
-                             bool bSingleShot) {
+                             bool bSingleShot, const platform::ValueDetail& detail) {
     mvRawValue = vValue;
     mdTimeStamp = dTimeStamp;
     if (vValue.IsArray()) {
@@ -42,6 +42,7 @@ void Channel::OpcSetRawValue(const Variant& vValue, int32_t lQuality, double dTi
         const std::string& sText = mvRawValue.AsStr();
         mvRawValue = Variant::Str(sText.substr(0, sText.find('\0')));
     }
+    mOpcSample = {mvRawValue, lQuality, dTimeStamp, detail, mOpcSample.number + 1};
     if ((lQuality & kStatusMask) == kLastKnown) {
         lQuality = (lQuality & ~kSubStatusMask) | kQualityGood;
     }

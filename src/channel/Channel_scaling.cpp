@@ -72,27 +72,17 @@ ErrorInfo Channel::ConvertFromPercent(double dPercent, double& dValue) const {
     return CheckFinite(dValue);
 }
 
-ErrorInfo Channel::ScaledRawValue(const Variant& vRaw, double& dValue) const {
-    Variant vNumber;
-    if (ErrorInfo error = ChangeType(vNumber, vRaw, VT_R8, mPlatform.locale)) {
-        return error;
-    }
-    dValue = vNumber.AsR8();
-    if (mbNeedsScaling) {
-        dValue = dValue * mdScaleFactor + mdScaleOffset;
-    }
-    return CheckFinite(dValue);
-}
-
 // A raw value that is no number is read as well as possible from its text,
-// unscaled.
+// unscaled. A number that is not finite (NaN, an infinity, or one that
+// scaling takes beyond the largest) stays what it is.
 double Channel::CurrentValue() {
     const Variant vRaw = RawValue();
-    double dValue = 0;
-    if (ScaledRawValue(vRaw, dValue)) {
+    Variant vNumber;
+    if (ChangeType(vNumber, vRaw, VT_R8, mPlatform.locale)) {
         return TextToSingle(mPlatform, VariantText(vRaw), false);
     }
-    return dValue;
+    const double dValue = vNumber.AsR8();
+    return mbNeedsScaling ? dValue * mdScaleFactor + mdScaleOffset : dValue;
 }
 
 std::string Channel::FormatCurrentValue() {

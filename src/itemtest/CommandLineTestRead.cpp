@@ -1,13 +1,11 @@
 #include "itemtest/CommandLineTestRead.h"
 
 #include <cmath>
-#include <cstdio>
 #include <ostream>
 
 #include "channel/Channel.h"
 #include "document/TunFile.h"
-#include "itemtest/QualityWords.h"
-#include "platform/OleDate.h"
+#include "itemtest/IsoTimeText.h"
 #include "platform/Platform.h"
 #include "platform/ValueText.h"
 #include "util/ProgramRoutines.h"
@@ -18,18 +16,6 @@ namespace {
 
 // How long one wait of the event loop lasts before the loop looks again.
 constexpr uint32_t kWaitSliceMs = 60000;
-
-std::string IsoTime(double dStamp) {
-    const std::optional<OleDateParts> parts = OleDateToParts(dStamp);
-    if (!parts) {
-        return "-";
-    }
-    char text[40];
-    std::snprintf(text, sizeof text, "%04d-%02d-%02dT%02d:%02d:%02d.%03d", parts->year,
-                  parts->month, parts->day, parts->hour, parts->minute, parts->second,
-                  parts->millisecond);
-    return text;
-}
 
 }  // namespace
 
@@ -75,12 +61,22 @@ int CommandLineTestRead::Run() {
 }
 
 void CommandLineTestRead::DisplayChanged() {
-    if (mbBackendTold || mcTest == nullptr || mcTest->Display().backend.empty()) {
+    if (mcTest == nullptr) {
         return;
     }
-    mbBackendTold = true;
-    mErr << "Backend: " << mcTest->Display().backend << '\n';
-    mErr.flush();
+    const ItemTestDisplay& shown = mcTest->Display();
+    if (!mbBackendTold && !shown.backend.empty()) {
+        mbBackendTold = true;
+        mErr << "Backend: " << shown.backend << '\n';
+        mErr.flush();
+    }
+    if (mOptions.verbose && shown.serverAnswer != msAnswerTold) {
+        msAnswerTold = shown.serverAnswer;
+        if (!msAnswerTold.empty()) {
+            mErr << msAnswerTold << '\n';
+            mErr.flush();
+        }
+    }
 }
 
 void CommandLineTestRead::ValuesShown() {
@@ -88,10 +84,23 @@ void CommandLineTestRead::ValuesShown() {
         return;
     }
     ++mlShown;
+    PrintValue(true);
+}
+
+void CommandLineTestRead::ValueRefused() {
+    PrintValue(false);
+}
+
+// The value as the server sent it; a refused one has no scaled value.
+void CommandLineTestRead::PrintValue(bool bTaken) {
+    const OpcSample& sample = mcChannel->LastOpcSample();
     std::string sRaw;
-    (void)ValueToText(mcChannel->RawValue(), mPlatform.locale, sRaw);
-    mOut << IsoTime(mcChannel->OpcTimeStamp()) << '\t' << sRaw << '\t' << mcTest->Display().engValue
-         << '\t' << QualityWords(mcChannel->OpcQuality()) << '\n';
+    (void)ValueToText(sample.value, mPlatform.locale, sRaw);
+    const ItemTestDisplay& shown = mcTest->Display();
+    const double dSource = sample.detail.sourceTimeStamp;
+    mOut << IsoTimeText(sample.timeStamp) << '\t' << sRaw << '\t'
+         << (bTaken ? shown.engValue : std::string()) << '\t' << shown.quality << '\t'
+         << (dSource != 0 ? IsoTimeText(dSource) : std::string()) << '\n';
     mOut.flush();
 }
 

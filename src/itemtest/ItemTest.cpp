@@ -34,6 +34,8 @@ ItemTest::~ItemTest() {
 
 void ItemTest::Start() {
     mDisplay.caption = "Trying to connect...";
+    // A value from an earlier test of the channel is none of this one's.
+    mlSampleShown = mcChannel.LastOpcSample().number;
     miState = 0;
     mbInTimer = false;
     StartTimer(kConnectTickMs);
@@ -135,6 +137,10 @@ void ItemTest::Create() {
         miState = 4;
         return;
     }
+    AnswerOrEnd();
+    if (mbUnloaded) {
+        return;
+    }
     mProgress.ReInitialize();
     (void)mProgress.TimeUp();  // draws the bar
     mProgress.SetVisible(true);
@@ -150,9 +156,12 @@ void ItemTest::RetryCreate() {
     NoteBackend();
     if (bCreated) {
         mProgress.SetVisible(false);
+        ShowServerAnswer("");
         miState = 4;
     } else if (bTimeUp && !mbUnloaded) {
         Close();
+    } else if (!mbUnloaded) {
+        AnswerOrEnd();
     }
 }
 
@@ -175,17 +184,24 @@ void ItemTest::FirstValue() {
     switch (mcChannel.Online(mProgress.TimeUp())) {
         case OnlineState::GoingOnline:
             mProgress.SetVisible(true);
+            if (NoteRefusedValue()) {
+                ShowServerAnswer(mDisplay.quality);
+            }
             break;
         case OnlineState::Online:
             SetBusy(0);
             mProgress.SetVisible(false);
+            ShowServerAnswer("");
             miState = 6;
             LayOutValueDisplay();
             break;
         default:
             SetBusy(0);
-            ShowReadError("Error trying to read ", MsgBoxStyle::Exclamation);
-            Close();
+            (void)NoteRefusedValue();
+            if (!mbUnloaded) {
+                ShowReadError("Error trying to read ", MsgBoxStyle::Exclamation);
+                Close();
+            }
             break;
     }
 }
@@ -199,8 +215,11 @@ void ItemTest::Refresh() {
         return;
     }
     if (mcChannel.Online(false) != OnlineState::Online) {
-        ShowReadError("Error reading ", MsgBoxStyle::Critical);
-        Close();
+        (void)NoteRefusedValue();
+        if (!mbUnloaded) {
+            ShowReadError("Error reading ", MsgBoxStyle::Critical);
+            Close();
+        }
         return;
     }
     if (mcChannel.IsOnline()) {
@@ -231,14 +250,21 @@ void ItemTest::NoteBackend() {
     if (!mDisplay.backend.empty()) {
         return;
     }
+    if (const CvOpcAutoClient* cClient = ServingClient()) {
+        mDisplay.backend = cClient->BackendName();
+        Notify();
+    }
+}
+
+// Also after the channel let go of it (a bad value took it offline).
+CvOpcAutoClient* ItemTest::ServingClient() const {
     for (const std::shared_ptr<CvOpcAutoClient>& cClient : mcTunFile.OpcClients()) {
         if (cClient->ServerID() == mcChannel.OpcServerID() &&
             cClient->ServerNode() == mcChannel.OpcComputer()) {
-            mDisplay.backend = cClient->BackendName();
-            Notify();
-            return;
+            return cClient.get();
         }
     }
+    return nullptr;
 }
 
 void ItemTest::SetBusy(int16_t iPointer) {

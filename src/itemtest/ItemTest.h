@@ -1,6 +1,7 @@
 #pragma once
 
 #include <cstdint>
+#include <map>
 #include <memory>
 #include <optional>
 #include <string>
@@ -11,7 +12,9 @@
 namespace cv {
 
 class Channel;
+class CvOpcAutoClient;
 class TunFile;
+struct OpcSample;
 struct Platform;
 
 namespace platform {
@@ -28,10 +31,12 @@ class DdeLink;
 //   wait is up   4 go online (OPC: the group's update rate is the sample
 //   interval)   5 wait for the first value   6 refresh
 //
-// Any failure shows its diagnosis (the channel's own, or the stored error
-// text through GetErrorString) and closes the test. A tick that finds
-// another still running (a message box is open, a server call waits)
-// returns at once.
+// While it retries or waits, the display shows what the server answered
+// last. Any failure shows its diagnosis (the channel's own, or the stored
+// error text through GetErrorString) and closes the test; one that no retry
+// can change (an item ID the server's syntax refuses, a server that is not
+// registered) does so at once. A tick that finds another still running (a
+// message box is open, a server call waits) returns at once.
 class ItemTest {
   public:
     // The window (or the terminal) that shows the test.
@@ -44,6 +49,10 @@ class ItemTest {
         virtual void CloseRequested() = 0;
         // A refresh put new values into Display().
         virtual void ValuesShown() {}
+        // A value the channel did not take arrived (a bad quality, or no
+        // number where one is expected): Display() holds its time stamps
+        // and quality, and the test ends or waits on.
+        virtual void ValueRefused() {}
     };
 
     static constexpr uint32_t kConnectTickMs = 100;
@@ -103,11 +112,20 @@ class ItemTest {
     void NoteBackend();
     void ShowReadError(const std::string& sPrefix, int32_t lIcon);
     void StartTimer(uint32_t lIntervalMs);
+    CvOpcAutoClient* ServingClient() const;
+
+    // What the server answered while the test waits (ItemTest_wait.cpp).
+    void AnswerOrEnd();
+    void ShowServerAnswer(const std::string& sAnswer);
+    bool NoteRefusedValue();
 
     // The value display (ItemTest_display.cpp).
     void LayOutValueDisplay();
     void SelectMode();
     void ShowValues();
+    void ShowSample(const OpcSample& sample);
+    void ShowRange(double dValue);
+    std::string StatusName(uint32_t lStatus);
     int32_t PlacesFromText(const std::string& sText);
     void Notify();
 
@@ -119,6 +137,10 @@ class ItemTest {
     std::shared_ptr<platform::DdeLink> mcDdeLabel;
     std::optional<int32_t> mlWaitOverride;
     ItemTestDisplay mDisplay;
+    // The server's names for the statuses it gave, once asked.
+    std::map<uint32_t, std::string> mStatusNames;
+    // The number of the last value shown or told (OpcSample::number).
+    uint32_t mlSampleShown = 0;
     int16_t miState = 0;
     bool mbInTimer = false;
     bool mbChanged = false;

@@ -5,6 +5,8 @@
 #include "document/ModeMapClass.h"
 #include "document/TunFile.h"
 #include "itemtest/ItemTest.h"
+#include "itemtest/QualityWords.h"
+#include "opc/CvOpcAutoClient.h"
 #include "platform/AsciiCase.h"
 #include "platform/DateText.h"
 #include "platform/DdeLink.h"
@@ -28,6 +30,17 @@ std::string ProtocolName(int32_t lComType) {
             return "OPC";
         default:
             return "OPC HDA";
+    }
+}
+
+int32_t QualityColor(int32_t lQuality) {
+    switch (LevelOf(lQuality)) {
+        case QualityLevel::Good:
+            return ItemTestDisplay::kGoodColor;
+        case QualityLevel::Uncertain:
+            return ItemTestDisplay::kUncertainColor;
+        default:
+            return ItemTestDisplay::kBadColor;
     }
 }
 
@@ -74,24 +87,79 @@ void ItemTest::SelectMode() {
 }
 
 void ItemTest::ShowValues() {
+    const int32_t lComType = mcChannel.ComType();
+    if (lComType == ComTypeCode::Opc || lComType == ComTypeCode::OpcHda) {
+        mlSampleShown = mcChannel.LastOpcSample().number;
+        ShowSample(mcChannel.LastOpcSample());
+        if (mbUnloaded) {
+            return;
+        }
+    }
     if (mcChannel.SpecificChannelType() == 0) {
-        mDisplay.engValue = mcChannel.FormatCurrentValue();
+        const double dValue = mcChannel.CurrentValue();
+        mDisplay.engValue = mcChannel.FormatDecPt(dValue);
+        ShowRange(dValue);
     }
     std::string sRaw;
     (void)ValueToText(mcChannel.RawValue(), mPlatform.locale, sRaw);
     mDisplay.instValue = ModeMapClass::StripDDETerminators(sRaw);
-    std::string sTime;
-    std::string sDate;
-    const double dStamp = mcChannel.OpcTimeStamp();
-    if (!WriteOleDateAs(dStamp, mPlatform.locale.LongTimeFormat(), sTime) &&
-        !WriteOleDateAs(dStamp, mPlatform.locale.ShortDateFormat(), sDate)) {
-        mDisplay.timeStamp = sTime + "  " + sDate;
-    }
     if (mcDdeLabel) {
         mDisplay.ddeLabel = mcDdeLabel->Text();
     }
     Notify();
     mListener.ValuesShown();
+}
+
+// The time stamps to the millisecond and the quality in words. Asking the
+// server to name a status lets events run.
+void ItemTest::ShowSample(const OpcSample& sample) {
+    const auto stampText = [this](double dStamp) {
+        std::string sTime;
+        std::string sDate;
+        if (WriteOleDateToTheMillisecond(dStamp, mPlatform.locale.LongTimeFormat(), sTime) ||
+            WriteOleDateAs(dStamp, mPlatform.locale.ShortDateFormat(), sDate)) {
+            return std::string();
+        }
+        return sTime + "  " + sDate;
+    };
+    mDisplay.timeStamp = stampText(sample.timeStamp);
+    mDisplay.sourceTimeStamp =
+        sample.detail.sourceTimeStamp != 0 ? stampText(sample.detail.sourceTimeStamp) : "";
+    std::string sWords = QualityWords(sample.quality);
+    if (sample.detail.status != 0) {
+        const std::string sName = StatusName(sample.detail.status);
+        if (!sName.empty()) {
+            sWords += " (" + sName + ")";
+        }
+    }
+    mDisplay.quality = sWords;
+    mDisplay.qualityColor = QualityColor(sample.quality);
+}
+
+// Only where the user asked for scaling does the engineering range mean
+// anything; a value that is not a number is in no range.
+void ItemTest::ShowRange(double dValue) {
+    const double dLow = std::min(mcChannel.EngMin(), mcChannel.EngMax());
+    const double dHigh = std::max(mcChannel.EngMin(), mcChannel.EngMax());
+    // Rounding in the scaling is no departure from the range.
+    const double dSlack = (dHigh - dLow) * 1e-9;
+    const bool bScaled = mcChannel.NeedsScaling(mcTunFile) || mcTunFile.General().ScalePVandCO();
+    mDisplay.outOfRange = bScaled && (dValue < dLow - dSlack || dValue > dHigh + dSlack);
+    mDisplay.rangeMark =
+        "out of range " + mcChannel.FormatDecPt(dLow) + " to " + mcChannel.FormatDecPt(dHigh);
+}
+
+// The server's name for a status, asked once; empty when it has none.
+std::string ItemTest::StatusName(uint32_t lStatus) {
+    const auto known = mStatusNames.find(lStatus);
+    if (known != mStatusNames.end()) {
+        return known->second;
+    }
+    std::string sText;
+    CvOpcAutoClient* cClient = ServingClient();
+    const bool bNamed =
+        cClient != nullptr && !cClient->ServerErrorString(static_cast<int32_t>(lStatus), sText);
+    return mStatusNames[lStatus] = bNamed ? StatusNameOf(sText) : "";
 }
 
 bool ItemTest::SetDecimalPlaces(int32_t lPlaces, bool bQuiet) {

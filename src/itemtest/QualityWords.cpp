@@ -1,6 +1,8 @@
 #include "itemtest/QualityWords.h"
 
+#include <algorithm>
 #include <array>
+#include <cctype>
 #include <cstdio>
 
 namespace cv {
@@ -47,6 +49,39 @@ std::string QualityWords(int32_t lQuality) {
     static const std::array<const char*, 4> limits = {"", ", low limited", ", high limited",
                                                       ", constant"};
     return sWords + limits[static_cast<size_t>(lQuality & 3)];
+}
+
+QualityLevel LevelOf(int32_t lQuality) {
+    switch (lQuality & 0xC0) {
+        case 0xC0:
+            return QualityLevel::Good;
+        case 0x40:
+            return QualityLevel::Uncertain;
+        default:
+            return QualityLevel::Bad;
+    }
+}
+
+std::string StatusNameOf(const std::string& sServerText) {
+    constexpr size_t kMaxLength = 80;
+    std::string sName;
+    for (const char c : sServerText) {
+        if (c >= ' ' && c <= '~') {
+            sName += c;
+        }
+    }
+    const size_t colon = sName.find(':');
+    const bool bNamed =
+        colon != std::string::npos && colon > 0 &&
+        std::all_of(sName.begin(), sName.begin() + static_cast<long>(colon),
+                    [](char c) { return std::isalnum(static_cast<unsigned char>(c)) || c == '_'; });
+    if (bNamed) {
+        sName.resize(colon);
+    }
+    if (sName.size() > kMaxLength) {
+        sName.resize(kMaxLength);
+    }
+    return sName;
 }
 
 }  // namespace cv

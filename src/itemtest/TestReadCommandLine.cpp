@@ -204,6 +204,13 @@ TestReadCommand ParseTestReadCommand(const std::vector<std::string>& arguments) 
             command.action = Command::Action::Version;
             return command;
         }
+        if (name == "--verbose") {
+            if (value) {
+                return Usage("--verbose takes no value");
+            }
+            command.options.verbose = true;
+            continue;
+        }
         const auto setter = Setters().find(name);
         if (setter == Setters().end()) {
             return Usage("unknown option \"" + arguments[i] + "\"");
@@ -232,8 +239,13 @@ std::string TestReadUsage() {
            "       cvopctestclient --help | --version\n"
            "\n"
            "Reads one OPC item on the simulated plant or an OPC UA server without a\n"
-           "window and prints one line per value: time stamp, raw value, scaled value\n"
-           "and quality. Standard error first says which kind of server answered:\n"
+           "window and prints one line per value, tab-separated: the server's time\n"
+           "stamp, the raw value, the scaled value, the quality in words (with the\n"
+           "server's own name for its status where it has one) and the source time\n"
+           "stamp where the server sends one. Time stamps are ISO 8601 with\n"
+           "milliseconds and the zone (2025-01-01T08:00:01.250+01:00, or Z for UTC).\n"
+           "A bad value has its line too, without a scaled value, before the test\n"
+           "ends. Standard error first says which kind of server answered:\n"
            "\"Backend: OPC UA\" or \"Backend: simulated plant\".\n"
            "\n"
            "  --test-read SERVER   the OPC server: an OPC UA endpoint URL\n"
@@ -251,6 +263,8 @@ std::string TestReadUsage() {
            "                       server may take, however slowly it answers (10 s\n"
            "                       without --timeout)\n"
            "  --plant FILE         simulate the plant FILE describes\n"
+           "  --verbose            while waiting, print each answer of the server to\n"
+           "                       standard error (\"The server answered: ...\")\n"
            "\n"
            "OPC UA servers (opc.tcp://host:port/path) are reached as chosen for them in\n"
            "the window (at first the most secure way they offer), unless told here:\n"

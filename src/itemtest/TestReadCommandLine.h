@@ -11,7 +11,7 @@ namespace cv {
 //
 //   cvopctestclient --test-read '\\Node\Server' --item ID [--access-path P]
 //                   [--count N] [--interval S] [--scale INSTMIN:INSTMAX:ENGMIN:ENGMAX]
-//                   [--timeout S] [--plant FILE]
+//                   [--timeout S] [--plant FILE] [--verbose]
 //
 // Numbers are written with a point, whatever the regional settings.
 struct TestReadScale {
@@ -31,6 +31,8 @@ struct TestReadOptions {
     // Overrides the remembered wait for this run only.
     std::optional<double> timeoutSec;
     std::string plantFile;
+    // Also print each answer of the server while the test waits for it.
+    bool verbose = false;
     // OPC UA security for this run; empty: as chosen for the server in the
     // window (by default the most secure it offers). The mode is "None",
     // "Sign" or "SignAndEncrypt", the policy "Basic256Sha256" or

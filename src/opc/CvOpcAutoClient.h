@@ -79,6 +79,8 @@ class CvOpcAutoClient {
     // after the first channel that is not online once it has its value.
     ErrorInfo SingleShotReadGroup(int32_t lGroup);
     ErrorInfo SingleShotReadOneItem(Channel& cChannel);
+    // The server's own text for a code it gave (GetErrorString).
+    ErrorInfo ServerErrorString(int32_t lCode, std::string& sText);
     // Writes sValue to the channel's item, converted to the item's type.
     // Answers the server's message for an item error (error then stays as
     // any one-shot read before the write left it), or an empty text with
@@ -159,11 +161,22 @@ class CvOpcAutoClient {
 
     // Reads, writes and notifications (CvOpcAutoClient_data.cpp, _write.cpp).
     void ChannelDataChange(int32_t lGroup, const platform::DataChangeArgs& args);
+    // What a SyncRead answers.
+    struct ReadAnswer {
+        platform::OneBased<Variant> values;
+        platform::OneBased<int32_t> errors;
+        platform::OneBased<int32_t> qualities;
+        platform::OneBased<double> stamps;
+        platform::OneBased<platform::ValueDetail> details;
+        // Every array but the details (which a server may leave out) holds
+        // lCount entries.
+        bool Covers(int32_t lCount) const;
+        platform::ValueDetail Detail(int32_t i) const;
+    };
+    ErrorInfo SyncRead(const GroupPtr& group, const std::vector<int32_t>& handles,
+                       ReadAnswer& answer, const Watch& watch);
     ErrorInfo DeliverRead(const std::vector<ServedChannels::Entry>& targets, int32_t lGroup,
-                          const platform::OneBased<Variant>& values,
-                          const platform::OneBased<int32_t>& errors,
-                          const platform::OneBased<int32_t>& qualities,
-                          const platform::OneBased<double>& stamps, const Watch& watch);
+                          const ReadAnswer& answer, const Watch& watch);
     int16_t KnownItemType(const Channel& cChannel) const;
     Variant ValueToWrite(const std::string& sValue, int16_t iVarType) const;
     std::string ServerMessage(int32_t lItemError, ErrorInfo& error, const Watch& watch);

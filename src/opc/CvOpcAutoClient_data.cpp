@@ -21,6 +21,14 @@ std::string SyncReadLabel(int32_t lGroup, size_t lCount) {
 
 }  // namespace
 
+bool CvOpcAutoClient::ReadAnswer::Covers(int32_t lCount) const {
+    return std::min({values.Count(), errors.Count(), qualities.Count(), stamps.Count()}) >= lCount;
+}
+
+platform::ValueDetail CvOpcAutoClient::ReadAnswer::Detail(int32_t i) const {
+    return i <= details.Count() ? details(i) : platform::ValueDetail{};
+}
+
 ErrorInfo CvOpcAutoClient::SingleShotReadGroup(int32_t lGroup) {
     const Watch watch = Watching();
     std::vector<ServedChannels::Entry> targets;
@@ -32,48 +40,51 @@ ErrorInfo CvOpcAutoClient::SingleShotReadGroup(int32_t lGroup) {
         }
     }
     Trace(SyncReadLabel(lGroup, handles.size()));
-    const GroupPtr group = Group(lGroup);
+    ReadAnswer answer;
+    if (ErrorInfo error = SyncRead(Group(lGroup), handles, answer, watch)) {
+        return error;
+    }
+    return DeliverRead(targets, lGroup, answer, watch);
+}
+
+// A device read of the handles; a server gone meanwhile is told as such.
+ErrorInfo CvOpcAutoClient::SyncRead(const GroupPtr& group, const std::vector<int32_t>& handles,
+                                    ReadAnswer& answer, const Watch& watch) {
     if (!group) {
         return ClientErrors::NoObject();
     }
-    OneBased<Variant> values;
-    OneBased<int32_t> errors;
-    OneBased<int32_t> qualities;
-    OneBased<double> stamps;
     const ErrorInfo call =
         group->SyncRead(platform::OpcDataSource::Device, static_cast<int32_t>(handles.size()),
-                        OneBased<int32_t>(handles), values, errors, qualities, stamps);
+                        OneBased<int32_t>(handles), answer.values, answer.errors, answer.qualities,
+                        answer.stamps, answer.details);
     if (watch.Ended()) {
         return ClientErrors::Disconnected();
     }
     if (call) {
         return call;
     }
-    return DeliverRead(targets, lGroup, values, errors, qualities, stamps, watch);
+    return answer.Covers(static_cast<int32_t>(handles.size())) ? ErrorInfo{}
+                                                               : ClientErrors::IncompleteAnswer();
 }
 
 // Each value goes to the channel whose item was asked for in its place,
 // while that channel is still served: a channel removed meanwhile ends the
 // delivery instead of passing its value to another.
 ErrorInfo CvOpcAutoClient::DeliverRead(const std::vector<ServedChannels::Entry>& targets,
-                                       int32_t lGroup, const OneBased<Variant>& values,
-                                       const OneBased<int32_t>& errors,
-                                       const OneBased<int32_t>& qualities,
-                                       const OneBased<double>& stamps, const Watch& watch) {
+                                       int32_t lGroup, const ReadAnswer& answer,
+                                       const Watch& watch) {
     const auto lCount = static_cast<int32_t>(targets.size());
-    if (std::min({values.Count(), errors.Count(), qualities.Count(), stamps.Count()}) < lCount) {
-        return ClientErrors::IncompleteAnswer();
-    }
     for (int32_t i = 1; i <= lCount; ++i) {
-        if (errors(i) != 0) {
-            return ClientErrors::ItemError(errors(i));
+        if (answer.errors(i) != 0) {
+            return ClientErrors::ItemError(answer.errors(i));
         }
         const int32_t lHandle = targets[static_cast<size_t>(i) - 1].clientHandle;
         Channel* const* cFound = mcChannels.Find(lHandle, lGroup);
         if (cFound == nullptr || *cFound == nullptr) {
             return {};
         }
-        (*cFound)->OpcSetRawValue(values(i), qualities(i), stamps(i), true);
+        (*cFound)->OpcSetRawValue(answer.values(i), answer.qualities(i), answer.stamps(i), true,
+                                  answer.Detail(i));
         if (watch.Ended()) {
             return {};
         }
@@ -93,31 +104,16 @@ ErrorInfo CvOpcAutoClient::SingleShotReadOneItem(Channel& cChannel) {
     }
     const ServedChannels::Entry entry = *found;
     Trace(SyncReadLabel(entry.group, 1));
-    const GroupPtr group = Group(entry.group);
-    if (!group) {
-        return ClientErrors::NoObject();
+    ReadAnswer answer;
+    if (ErrorInfo error = SyncRead(Group(entry.group), {entry.serverHandle}, answer, watch)) {
+        return error;
     }
-    OneBased<Variant> values;
-    OneBased<int32_t> errors;
-    OneBased<int32_t> qualities;
-    OneBased<double> stamps;
-    const ErrorInfo call =
-        group->SyncRead(platform::OpcDataSource::Device, 1, OneBased<int32_t>{entry.serverHandle},
-                        values, errors, qualities, stamps);
-    if (watch.Ended()) {
-        return ClientErrors::Disconnected();
-    }
-    if (call) {
-        return call;
-    }
-    if (std::min({values.Count(), errors.Count(), qualities.Count(), stamps.Count()}) < 1) {
-        return ClientErrors::IncompleteAnswer();
-    }
-    if (errors(1) != 0) {
-        return ClientErrors::ItemError(errors(1));
+    if (answer.errors(1) != 0) {
+        return ClientErrors::ItemError(answer.errors(1));
     }
     if (Channel* cRead = entry.Get()) {
-        cRead->OpcSetRawValue(values(1), qualities(1), stamps(1), true);
+        cRead->OpcSetRawValue(answer.values(1), answer.qualities(1), answer.stamps(1), true,
+                              answer.Detail(1));
     }
     return {};
 }
@@ -146,7 +142,10 @@ void CvOpcAutoClient::ChannelDataChange(int32_t lGroup, const platform::DataChan
         if (*cFound == nullptr) {
             continue;
         }
-        (*cFound)->OpcSetRawValue(args.ItemValues(i), args.Qualities(i), args.TimeStamps(i), false);
+        const platform::ValueDetail detail =
+            i <= args.Details.Count() ? args.Details(i) : platform::ValueDetail{};
+        (*cFound)->OpcSetRawValue(args.ItemValues(i), args.Qualities(i), args.TimeStamps(i), false,
+                                  detail);
         if (watch.Ended()) {
             return;
         }

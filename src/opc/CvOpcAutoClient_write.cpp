@@ -122,4 +122,14 @@ std::string CvOpcAutoClient::ServerMessage(int32_t lItemError, ErrorInfo& error,
     return "Error message from OPC Server: \"" + sText + "\".";
 }
 
+ErrorInfo CvOpcAutoClient::ServerErrorString(int32_t lCode, std::string& sText) {
+    const Watch watch = Watching();
+    const auto server = mcOpcServer;
+    if (!server) {
+        return ClientErrors::NoObject();
+    }
+    const ErrorInfo error = server->GetErrorString(lCode, sText);
+    return watch.Ended() ? ClientErrors::Disconnected() : error;
+}
+
 }  // namespace cv

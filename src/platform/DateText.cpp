@@ -31,8 +31,9 @@ int32_t Weekday(const OleDateParts& parts) {
 }
 
 // The text of one run of a format letter ("dd", "MMM", "tt"); nullopt for
-// letters that are not fields.
-std::optional<std::string> FieldText(char letter, size_t count, const OleDateParts& parts) {
+// letters that are not fields. With bMilliseconds the seconds carry them.
+std::optional<std::string> FieldText(char letter, size_t count, const OleDateParts& parts,
+                                     bool bMilliseconds) {
     const bool pm = parts.hour >= 12;
     const int32_t hour12 = parts.hour % 12 == 0 ? 12 : parts.hour % 12;
     switch (letter) {
@@ -57,7 +58,8 @@ std::optional<std::string> FieldText(char letter, size_t count, const OleDatePar
         case 'm':
             return Padded(parts.minute, count > 1 ? 2 : 1);
         case 's':
-            return Padded(parts.second, count > 1 ? 2 : 1);
+            return Padded(parts.second, count > 1 ? 2 : 1) +
+                   (bMilliseconds ? "." + Padded(parts.millisecond, 3) : "");
         case 't':
             return std::string(pm ? "PM" : "AM").substr(0, count > 1 ? 2 : 1);
         default:
@@ -65,7 +67,8 @@ std::optional<std::string> FieldText(char letter, size_t count, const OleDatePar
     }
 }
 
-std::string ApplyFormat(std::string_view format, const OleDateParts& parts) {
+std::string ApplyFormat(std::string_view format, const OleDateParts& parts,
+                        bool bMilliseconds = false) {
     std::string text;
     for (size_t i = 0; i < format.size();) {
         const char letter = format[i];
@@ -80,7 +83,7 @@ std::string ApplyFormat(std::string_view format, const OleDateParts& parts) {
         while (i + count < format.size() && format[i + count] == letter) {
             ++count;
         }
-        const std::optional<std::string> field = FieldText(letter, count, parts);
+        const std::optional<std::string> field = FieldText(letter, count, parts, bMilliseconds);
         text += field ? *field : std::string(format.substr(i, count));
         i += count;
     }
@@ -130,6 +133,15 @@ ErrorInfo WriteOleDateAs(double oleDate, std::string_view format, std::string& t
         return InvalidArgumentError();
     }
     text = ApplyFormat(format, *parts);
+    return {};
+}
+
+ErrorInfo WriteOleDateToTheMillisecond(double oleDate, std::string_view format, std::string& text) {
+    const std::optional<OleDateParts> parts = OleDateToParts(oleDate);
+    if (!parts) {
+        return InvalidArgumentError();
+    }
+    text = ApplyFormat(format, *parts, true);
     return {};
 }
 

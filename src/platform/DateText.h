@@ -24,6 +24,9 @@ ErrorInfo WriteOleDate(double oleDate, const platform::Locale& locale, std::stri
 // The date in one format of the regional kind ("h:mm:ss tt", "M/d/yyyy"),
 // rounded to the second. Fails like WriteOleDate.
 ErrorInfo WriteOleDateAs(double oleDate, std::string_view format, std::string& text);
+// The same to the millisecond: each seconds field is followed by a point and
+// three digits ("1:02:03.250 PM").
+ErrorInfo WriteOleDateToTheMillisecond(double oleDate, std::string_view format, std::string& text);
 // Reads a date, a time or both: three numbers in the order of the short-date
 // format (or year first when it has three or four digits), or a month name
 // with a day and a year; a time of hours and minutes with optional seconds

@@ -76,6 +76,56 @@ class frmOpcTestClientTestReadTest : public QObject {
         QVERIFY(window->Document().OpcClients().empty());
         QVERIFY(tp->dialogs.Messages().empty());
     }
+
+    // A refused field keeps the focus, however the window system hands it
+    // back after the message boxes, and no test read uses a value other
+    // than the one shown: the field is checked again first.
+    void aRefusedFieldKeepsTheFocusAndATestReadUsesWhatIsShown() {
+        QVERIFY(
+            !tp->plant.SetItemValue("", "Sim.Plant.1", "Types.Memory.R8", cv::Variant::R8(47.095)));
+        Enter("txtServerID", "Sim.Plant.1");
+        Enter("txtItemID", "Types.Memory.R8");
+        tp->dialogs.QueueAnswer(cv::MsgBoxResult::Yes);  // to "Continue showing this message?"
+        Enter("txtEngMax", "abc");
+        auto* txtEngMax = window->findChild<QLineEdit*>("txtEngMax");
+        QCOMPARE(txtEngMax->text(), QString("0"));
+        QCOMPARE(window->TestChannel().EngMax(), 100.0);
+        window->findChild<QLineEdit*>("txtInstMin")->setFocus(Qt::ActiveWindowFocusReason);
+        QCoreApplication::processEvents();
+        QVERIFY(txtEngMax->hasFocus());
+
+        QString scaled;
+        const auto readScaled = [&] {
+            scaled.clear();
+            QTimer::singleShot(0, this, [&] {
+                if (auto* test = qobject_cast<cv::frmDDETest*>(QApplication::activeModalWidget())) {
+                    tp->events.Advance(2000);
+                    QCoreApplication::processEvents();
+                    scaled = test->findChild<QLabel*>("lblEngValue")->text();
+                    test->close();
+                }
+            });
+            QTest::mouseClick(window->findChild<QPushButton*>("cmdTest"), Qt::LeftButton);
+            QCoreApplication::processEvents();
+        };
+        tp->dialogs.Clear();
+        readScaled();
+        QCOMPARE(scaled, QString());
+        QCOMPARE(tp->dialogs.Last().text,
+                 std::string("Eng span Min must be more than .05 from Max."));
+        QVERIFY(txtEngMax->hasFocus());
+
+        // A later field typed in before the refusal cancelled its check is
+        // checked before the test read as well.
+        txtEngMax->selectAll();
+        QTest::keyClicks(txtEngMax, "50");
+        window->findChild<QLineEdit*>("txtInstMax")->setText("");
+        QTest::keyClicks(window->findChild<QLineEdit*>("txtInstMax"), "200");
+        readScaled();
+        QCOMPARE(window->TestChannel().EngMax(), 50.0);
+        QCOMPARE(window->TestChannel().InstMax(), 200.0);
+        QCOMPARE(scaled, QString("11.77"));
+    }
 };
 
 QTEST_MAIN(frmOpcTestClientTestReadTest)

@@ -1,5 +1,6 @@
 #include <chrono>
 #include <memory>
+#include <string>
 #include <tuple>
 
 #include <gtest/gtest.h>
@@ -54,10 +55,46 @@ TEST_F(OpcChannel, FirstValueMustBeANumberAndQualityDecidesTheState) {
     EXPECT_EQ(std::tuple(channel.IsOnline(), channel.OpcRawValueVarType()), std::tuple(false, 0));
     EXPECT_EQ(channel.ErrorStr(), "OPC Server error: \"Not connected\"");
     EXPECT_EQ(channel.ErrorStr(), "");  // told once
-    channel.OpcSetRawValue(Variant::R8(4), 0x1C, 0, true);
-    EXPECT_EQ(channel.ErrorStr(), "OPC Server error: \"Out of service\"");
-    channel.OpcSetRawValue(Variant::R8(5), 0x00, 0, true);
-    EXPECT_EQ(channel.ErrorStr(), "Bad value of unknown status reported by OPC Server.");
+}
+
+// Each reason in words: a bad one as the error text of a one-shot read, an
+// uncertain one in the warning.
+TEST_F(OpcChannel, QualityTextNamesEveryReason) {
+    struct Case {
+        int32_t quality;
+        std::string text;
+    };
+    const Case cases[] = {
+        {0x00, "Bad value of unknown status reported by OPC Server."},
+        {0x04, "OPC Server configuration error"},
+        {0x08, "OPC Server error: \"Not connected\""},
+        {0x0C, "OPC Server error: \"Device failure\""},
+        {0x10, "OPC Server error: \"Sensor failure\""},
+        {0x18, "OPC Server error: \"Communications failure\""},
+        {0x1F, "OPC Server error: \"Out of service\""},
+        {0x20, "Bad value of unknown status reported by OPC Server."},
+        {0x40, "Uncertain value - Undefined reason"},
+        {0x44, "Uncertain value - Last usable"},
+        {0x48, "Uncertain value - Undefined reason"},
+        {0x50, "Uncertain value - Sensor Cal"},
+        {0x54, "Uncertain value - EGU exceeded"},
+        {0x59, "Uncertain value - Sub normal"},
+    };
+    for (const Case& c : cases) {
+        Channel read(tp.platform);
+        read.SetComType(ComTypeCode::Opc);
+        read.SetExpectANumber(false);
+        read.MarkGoingOnline();
+        tp.run.UncertainWarningOff = false;
+        read.OpcSetRawValue(Variant::R8(1), c.quality, 0, true);
+        if (read.IsOnline()) {
+            (void)read.RawValue();
+            EXPECT_NE(tp.dialogs.Last().text.find('"' + c.text + '"'), std::string::npos)
+                << std::hex << c.quality;
+        } else {
+            EXPECT_EQ(read.ErrorStr(), c.text) << std::hex << c.quality;
+        }
+    }
 }
 
 // A late value reaching a channel that timed out (and released its client)

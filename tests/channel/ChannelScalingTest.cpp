@@ -71,7 +71,7 @@ TEST_F(ScaledPv, CurrentValueConvertsOnlyOnceFlagsAreSet) {
     EXPECT_TRUE(channel.NeedsScaling(tunFile));
 }
 
-TEST_F(ScaledPv, NonNumberFallsBackToTextUnscaledWithTheQuestion) {
+TEST_F(ScaledPv, NonNumberTextFallsBackWithTheQuestionButNaNAndInfinitiesStay) {
     ASSERT_TRUE(channel.NeedsScaling(tunFile));
     channel.SetExpectANumber(false);
     channel.SetComType(ComTypeCode::Opc);
@@ -81,7 +81,10 @@ TEST_F(ScaledPv, NonNumberFallsBackToTextUnscaledWithTheQuestion) {
     ASSERT_EQ(tp.dialogs.Messages().size(), 1u);
     EXPECT_EQ(tp.dialogs.Last().title, "Conversion errors");
     channel.OpcSetRawValue(Variant::R8(1e308), 0xC0, 0, false);  // scaling overflows
-    EXPECT_TRUE(std::isfinite(channel.CurrentValue()));
+    EXPECT_EQ(channel.FormatCurrentValue(), "Infinity");
+    channel.OpcSetRawValue(Variant::R8(NAN), 0xC0, 0, false);
+    EXPECT_EQ(channel.FormatCurrentValue(), "NaN");
+    EXPECT_EQ(tp.dialogs.Messages().size(), 1u);
 }
 
 TEST(ChannelScaling, TextValuesFollowTheRegionalSettings) {

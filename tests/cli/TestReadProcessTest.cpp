@@ -14,6 +14,7 @@
 #include <regex>
 #include <sstream>
 #include <string>
+#include <utility>
 #include <vector>
 
 #include "support/TempFolder.h"
@@ -37,18 +38,21 @@ std::string ReadAll(const std::string& path) {
     return text.str();
 }
 
-// Runs the program with the arguments, no display and settings of its own.
-Outcome RunProgram(std::vector<std::string> arguments) {
+// Runs the program with the arguments, no display and settings of its own,
+// in the time zone given (POSIX TZ form).
+Outcome RunProgram(std::vector<std::string> arguments, const std::string& zone = "UTC0") {
     const cv::test::TempFolder folder;
     std::vector<std::string> environment;
     for (char** variable = environ; *variable != nullptr; ++variable) {
         const std::string entry(*variable);
         if (entry.rfind("DISPLAY=", 0) != 0 && entry.rfind("WAYLAND_DISPLAY=", 0) != 0 &&
-            entry.rfind("QT_QPA_PLATFORM=", 0) != 0 && entry.rfind("CVOPCTESTCLIENT_", 0) != 0) {
+            entry.rfind("QT_QPA_PLATFORM=", 0) != 0 && entry.rfind("CVOPCTESTCLIENT_", 0) != 0 &&
+            entry.rfind("TZ=", 0) != 0) {
             environment.push_back(entry);
         }
     }
     environment.push_back("CVOPCTESTCLIENT_CONFIG_DIR=" + folder.Path());
+    environment.push_back("TZ=" + zone);
     std::vector<char*> envp;
     for (auto& variable : environment) {
         envp.push_back(variable.data());
@@ -92,18 +96,64 @@ std::vector<std::string> Lines(const std::string& text) {
     return lines;
 }
 
+// Time stamps in ISO 8601 with milliseconds and the zone; no source time
+// stamp from a Data Access server.
 TEST(TestReadProcess, PrintsOneLinePerValueAndExitsZero) {
-    const Outcome outcome =
-        RunProgram({"--test-read", "Sim.Plant.1", "--item", "Types.ReadOnly.R8", "--count", "3",
-                    "--interval", "0.1", "--scale", "0:10:0:100"});
-    EXPECT_EQ(outcome.exitCode, 0) << outcome.err;
-    EXPECT_EQ(outcome.err, "Backend: simulated plant\n");
-    const std::vector<std::string> lines = Lines(outcome.out);
-    ASSERT_EQ(lines.size(), 3u) << outcome.out;
-    const std::regex line(
-        R"(\d{4}-\d\d-\d\dT\d\d:\d\d:\d\d\.\d{3}\t2\.71828182845905\t27\.18\tgood)");
-    for (const std::string& text : lines) {
-        EXPECT_TRUE(std::regex_match(text, line)) << text;
+    for (const auto& [tz, zone] : {std::pair("UTC0", "Z"), std::pair("XYZ-5:30", "\\+05:30")}) {
+        const Outcome outcome =
+            RunProgram({"--test-read", "Sim.Plant.1", "--item", "Types.ReadOnly.R8", "--count", "3",
+                        "--interval", "0.1", "--scale", "0:10:0:100"},
+                       tz);
+        EXPECT_EQ(outcome.exitCode, 0) << outcome.err;
+        EXPECT_EQ(outcome.err, "Backend: simulated plant\n");
+        const std::vector<std::string> lines = Lines(outcome.out);
+        ASSERT_EQ(lines.size(), 3u) << outcome.out;
+        const std::regex line(R"(\d{4}-\d\d-\d\dT\d\d:\d\d:\d\d\.\d{3})" + std::string(zone) +
+                              R"(\t2\.71828182845905\t27\.18\tgood\t)");
+        for (const std::string& text : lines) {
+            EXPECT_TRUE(std::regex_match(text, line)) << text;
+        }
+    }
+}
+
+// Every value has its line, a bad one too (without a scaled value), and a
+// number that is not one is not made one. Nobody is asked anything.
+TEST(TestReadProcess, BadValuesAndNaNPrintTheirLinesAndNothingIsAsked) {
+    struct Case {
+        std::string item;
+        int exitCode;
+        std::string line;
+    };
+    const Case cases[] = {
+        {"Special.NaN", 0, "\tNaN\tNaN\tgood\t"},
+        {"Quality.CommFailure", 1, "\t14\t\tbad, communication failure\t"},
+        {"Quality.LastKnown", 0, "\t13\t13.00\tbad, last known value\t"},
+    };
+    for (const Case& c : cases) {
+        const Outcome outcome =
+            RunProgram({"--test-read", "Sim.Plant.1", "--item", c.item, "--timeout", "0.5"});
+        EXPECT_EQ(outcome.exitCode, c.exitCode) << outcome.err;
+        const std::vector<std::string> lines = Lines(outcome.out);
+        ASSERT_EQ(lines.size(), 1u) << outcome.out;
+        EXPECT_EQ(lines[0].substr(lines[0].find('\t')), c.line);
+        EXPECT_EQ(outcome.err.find('?'), std::string::npos) << outcome.err;
+    }
+}
+
+// With --verbose, what the server answered while the test waited.
+TEST(TestReadProcess, VerboseTellsTheServersAnswersWhileItWaits) {
+    const std::string answer =
+        "The server answered: Either the Access Path or the Item Name are unknown to the OPC "
+        "Server; trying again until the wait ends\n";
+    for (const bool verbose : {true, false}) {
+        std::vector<std::string> arguments = {"--test-read",  "Sim.Plant.1", "--item",
+                                              "No.Such.Item", "--timeout",   "0.5"};
+        if (verbose) {
+            arguments.push_back("--verbose");
+        }
+        const Outcome outcome = RunProgram(arguments);
+        EXPECT_EQ(outcome.exitCode, 1);
+        EXPECT_EQ(outcome.err.find(answer) != std::string::npos, verbose) << outcome.err;
     }
 }
 
@@ -126,7 +176,7 @@ TEST(TestReadProcess, FailuresPrintTheDiagnosisAndExitOne) {
     for (const Case& c : cases) {
         const Outcome outcome = RunProgram(c.arguments);
         EXPECT_EQ(outcome.exitCode, 1) << c.diagnosis;
-        EXPECT_EQ(outcome.out, "");
+        EXPECT_EQ(outcome.out.empty(), c.diagnosis != "Communications failure") << outcome.out;
         EXPECT_NE(outcome.err.find(c.diagnosis), std::string::npos) << outcome.err;
     }
 }
@@ -210,6 +260,7 @@ TEST(TestReadProcess, UsageHelpVersionAndPlantFile) {
     };
     const Case cases[] = {
         {{"--help"}, 0, "--test-read SERVER", ""},
+        {{"--help"}, 0, "--verbose ", ""},
         {{"--version"}, 0, "cvopctestclient ", ""},
         {{"--test-read", "S"}, 2, "", "--test-read and --item are both needed"},
         {{"--test-read", "S", "--item", "X", "--interval", "99"}, 2, "", "--interval must be"},
@@ -255,8 +306,8 @@ TEST(TestReadPeer, ReadsScaledValuesOfAnOpcUaServer) {
         EXPECT_EQ(outcome.err, "Backend: OPC UA\n");
         const std::vector<std::string> lines = Lines(outcome.out);
         ASSERT_EQ(lines.size(), 2u) << outcome.out;
-        const std::regex line(R"(\d{4}-\d\d-\d\dT\d\d:\d\d:\d\d\.\d{3}\t)" + c.rawAndScaled +
-                              "\tgood");
+        const std::regex line(R"(\d{4}-\d\d-\d\dT\d\d:\d\d:\d\d\.\d{3}Z\t)" + c.rawAndScaled +
+                              R"(\tgood\t\d{4}-\d\d-\d\dT\d\d:\d\d:\d\d\.\d{3}Z)");
         for (const std::string& text : lines) {
             EXPECT_TRUE(std::regex_match(text, line)) << text;
         }

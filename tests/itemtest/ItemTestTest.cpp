@@ -1,7 +1,10 @@
 #include <gtest/gtest.h>
 
 #include <algorithm>
+#include <cmath>
 #include <string>
+#include <utility>
+#include <vector>
 
 #include "channel/Channel.h"
 #include "document/TunFile.h"
@@ -55,9 +58,16 @@ class ItemTestTest : public testing::Test, public ItemTest::Listener {
             [](const auto& e) { return e.label.find("SyncRead") != std::string::npos; }));
     }
 
-    void DisplayChanged() override { ++changes; }
+    void DisplayChanged() override {
+        ++changes;
+        if (!Shown().serverAnswer.empty() &&
+            (answers.empty() || answers.back() != Shown().serverAnswer)) {
+            answers.push_back(Shown().serverAnswer);
+        }
+    }
     void CloseRequested() override { ++closes; }
     void ValuesShown() override { ++refreshes; }
+    void ValueRefused() override { refused.push_back(Shown().quality); }
 
     test::TestPlatform t;
     TunFile cTunFile{t.platform};
@@ -66,6 +76,9 @@ class ItemTestTest : public testing::Test, public ItemTest::Listener {
     int changes = 0;
     int closes = 0;
     int refreshes = 0;
+    // The server's answers shown while waiting, and the refused values' qualities.
+    std::vector<std::string> answers;
+    std::vector<std::string> refused;
 };
 
 TEST_F(ItemTestTest, AGoodValueIsShownScaledWithItsTimeStampAtTheSampleInterval) {
@@ -90,10 +103,14 @@ TEST_F(ItemTestTest, AGoodValueIsShownScaledWithItsTimeStampAtTheSampleInterval)
     t.events.Advance(2000);
     EXPECT_EQ(Shown().instValue, "12");
     EXPECT_EQ(Shown().engValue, "50.00");
-    EXPECT_EQ(Shown().timeStamp, "12:00:00 AM  1/1/2025");
+    EXPECT_EQ(Shown().timeStamp, "12:00:00.000 AM  1/1/2025");
+    EXPECT_EQ(Shown().sourceTimeStamp, "") << "a Data Access server sends one time stamp";
+    EXPECT_EQ(Shown().quality, "good");
+    EXPECT_FALSE(Shown().outOfRange);
     SetValue("Types.Memory.R8", Variant::R8(20));
     t.events.Advance(2000);
     EXPECT_EQ(Shown().engValue, "100.00");
+    EXPECT_EQ(Shown().timeStamp, "12:00:03.100 AM  1/1/2025") << "to the millisecond";
     EXPECT_EQ(closes, 0);
     EXPECT_TRUE(t.dialogs.Messages().empty());
     test->Unload();
@@ -119,36 +136,51 @@ TEST_P(ItemTestUncertain, WarnsOnce) {
 INSTANTIATE_TEST_SUITE_P(Answer, ItemTestUncertain,
                          testing::Values(MsgBoxResult::Yes, MsgBoxResult::No));
 
-// Failures, each ending in its diagnosis and the test closed.
+// Failures, each ending in its diagnosis and the test closed: at the end of
+// the wait while the server's answer might still change (it may be starting),
+// at once when no retry can change it. Meanwhile the server's last answer is
+// shown.
 TEST_F(ItemTestTest, FailuresEndInTheirDiagnosis) {
     struct Case {
         std::string server;
         std::string item;
-        uint32_t closesBy;
+        bool atOnce;
         std::string title;
         std::string text;
+        std::string answer;
     };
+    const std::string kTrying = "; trying again until the wait ends";
     const Case cases[] = {
-        {kPlant, "Quality.CommFailure", 10300, "Error trying to read Quality.CommFailure",
-         "Communications failure"},
-        {kPlant, "No.Such.Item", 10300, "",
-         "Either the Access Path or the Item Name are unknown to the OPC Server."},
-        {kPlant, "Bad..Item", 10300, "",
-         "The Item name doesn't conform to the OPC Server's syntax."},
-        {"Sim.Nothing.1", "X", 10300, "",
-         "Server ID \"Sim.Nothing.1\" is not registered as an OPC Server in this computer."},
-        {"Sim.NoSubscribe.1", "Signals.Ramp", 10300, "",
-         "cannot subscribe to data change notifications"},
+        {kPlant, "Quality.CommFailure", false, "Error trying to read Quality.CommFailure",
+         "Communications failure", "The server answered: bad, communication failure" + kTrying},
+        {kPlant, "No.Such.Item", false, "",
+         "Either the Access Path or the Item Name are unknown to the OPC Server.",
+         "The server answered: Either the Access Path or the Item Name are unknown to the OPC "
+         "Server" +
+             kTrying},
+        {kPlant, "Bad..Item", true, "Error trying to read Bad..Item",
+         "The Item name doesn't conform to the OPC Server's syntax.", ""},
+        {"Sim.Nothing.1", "X", true, "Error trying to read X",
+         "Server ID \"Sim.Nothing.1\" is not registered as an OPC Server in this computer.", ""},
+        {"Sim.NotRunning.1", "X", false, "", "could not be started",
+         "The server answered: The server process could not be started. (80080005)" + kTrying},
+        {"Sim.NoSubscribe.1", "Signals.Ramp", false, "",
+         "cannot subscribe to data change notifications",
+         "The server answered: Problem with your OPC Server: \"Sim.NoSubscribe.1\"" + kTrying},
     };
     for (const Case& c : cases) {
         SCOPED_TRACE(c.item);
         t.dialogs.Clear();
         closes = 0;
+        answers.clear();
         Begin(c.server, c.item);
-        t.events.Advance(5000);
-        EXPECT_EQ(closes, 0) << "still waiting";
-        t.events.Advance(c.closesBy - 5000);
+        t.events.Advance(c.atOnce ? 100 : 5000);
+        EXPECT_EQ(closes, c.atOnce ? 1 : 0);
+        EXPECT_EQ(answers, c.answer.empty() ? std::vector<std::string>{}
+                                            : std::vector<std::string>{c.answer});
+        t.events.Advance(c.atOnce ? 0 : 5300);
         EXPECT_EQ(closes, 1);
+        EXPECT_EQ(Shown().serverAnswer, c.answer) << "shown until the end";
         EXPECT_TRUE(test->Closed());
         ASSERT_FALSE(t.dialogs.Messages().empty());
         if (!c.title.empty()) {
@@ -157,6 +189,84 @@ TEST_F(ItemTestTest, FailuresEndInTheirDiagnosis) {
         EXPECT_TRUE(Said(c.text)) << t.dialogs.Last().text;
         EXPECT_TRUE(cTunFile.OpcClients().empty());
     }
+}
+
+// Beside "Test successful": the quality in words, as the server sent it
+// (a last known value is shown, but as the bad value it is), in a colour
+// that is green only for good.
+TEST_F(ItemTestTest, EveryRefreshShowsTheQualityInWordsAndItsColour) {
+    t.run.UncertainWarningOff = true;  // the warning answered No
+    struct Case {
+        std::string item;
+        std::string quality;
+        int32_t color;
+    };
+    const Case cases[] = {
+        {"Quality.Good", "good", ItemTestDisplay::kGoodColor},
+        {"Quality.SensorCal", "uncertain, sensor not accurate", ItemTestDisplay::kUncertainColor},
+        {"Quality.LastKnown", "bad, last known value", ItemTestDisplay::kBadColor},
+    };
+    for (const Case& c : cases) {
+        SCOPED_TRACE(c.item);
+        Begin(kPlant, c.item);
+        t.events.Advance(2000);
+        ASSERT_EQ(test->State(), 6);
+        EXPECT_EQ(Shown().testResult, "Test successful");
+        EXPECT_EQ(Shown().quality, c.quality);
+        EXPECT_EQ(Shown().qualityColor, c.color);
+        test->Unload();
+    }
+    // A change of quality shows at the next refresh.
+    Begin(kPlant, "Types.Memory.R8");
+    t.events.Advance(2000);
+    ASSERT_FALSE(t.plant.SetItemQuality("", kPlant, "Types.Memory.R8", 0x58));
+    t.events.Advance(1000);
+    EXPECT_EQ(Shown().quality, "uncertain, sub-normal");
+    EXPECT_TRUE(t.dialogs.Messages().empty());
+}
+
+// Where the value is scaled, one outside the engineering range is marked
+// (also when both ranges are the same and scaling changes nothing).
+TEST_F(ItemTestTest, AnEngineeringValueOutsideItsRangeIsMarked) {
+    SetScaling(0, 100, 0, 100);
+    SetValue("Types.Memory.R8", Variant::R8(326.35));
+    Begin(kPlant, "Types.Memory.R8");
+    t.events.Advance(2000);
+    EXPECT_EQ(Shown().engValue, "326.35");
+    EXPECT_TRUE(Shown().outOfRange);
+    EXPECT_EQ(Shown().rangeMark, "out of range 0.00 to 100.00");
+    for (const auto& [raw, outside] : {std::pair(100.0, false), std::pair(-0.01, true),
+                                       std::pair(0.0, false), std::pair(double{NAN}, false)}) {
+        SetValue("Types.Memory.R8", Variant::R8(raw));
+        t.events.Advance(1000);
+        EXPECT_EQ(Shown().outOfRange, outside) << raw;
+    }
+    EXPECT_EQ(Shown().engValue, "NaN");
+    test->Unload();
+    // Unscaled, the engineering range says nothing about the value.
+    cTunFile.General().SetScalePVandCO(false);
+    SetValue("Types.Memory.R8", Variant::R8(326.35));
+    Begin(kPlant, "Types.Memory.R8");
+    t.events.Advance(2000);
+    EXPECT_FALSE(Shown().outOfRange);
+}
+
+// A bad value is told with its time stamp and quality, whether it comes
+// while the test waits or ends it.
+TEST_F(ItemTestTest, ABadValueIsToldBeforeTheTestEnds) {
+    Begin(kPlant, "Quality.CommFailure");
+    t.events.Advance(1000);
+    EXPECT_EQ(refused, std::vector<std::string>{"bad, communication failure"});
+    EXPECT_EQ(closes, 0);
+    test->Unload();
+    refused.clear();
+    Begin(kPlant, "Types.Memory.R8");
+    t.events.Advance(2000);
+    ASSERT_FALSE(t.plant.SetItemQuality("", kPlant, "Types.Memory.R8", 0x10));
+    t.events.Advance(1000);
+    EXPECT_EQ(refused, std::vector<std::string>{"bad, sensor failure"});
+    EXPECT_EQ(closes, 1);
+    EXPECT_TRUE(Said("Sensor failure"));
 }
 
 TEST_F(ItemTestTest, CreatingIsRetriedEachTickUntilTheRememberedWaitRunsOut) {

@@ -1,5 +1,7 @@
 #include <gtest/gtest.h>
 
+#include <string>
+
 #include "itemtest/QualityWords.h"
 
 namespace cv {
@@ -33,6 +35,24 @@ TEST(QualityWords, NamesEveryQualityItsReasonAndItsLimit) {
     };
     for (const Case& c : cases) {
         EXPECT_EQ(QualityWords(c.quality), c.words) << std::hex << c.quality;
+    }
+}
+
+// A server's text is not trusted: only the name at its head, printable, short.
+TEST(QualityWords, AStatusIsNamedByTheHeadOfTheServersText) {
+    struct Case {
+        std::string text;
+        std::string name;
+    };
+    const Case cases[] = {
+        {"Uncertain_SensorNotAccurate: The sensor reading is not accurate.",
+         "Uncertain_SensorNotAccurate"},
+        {"Bad value: no name", "Bad value: no name"},
+        {"Bad_\x1b[31mRed\r\n: x", "Bad_[31mRed: x"},
+        {std::string(200, 'N'), std::string(80, 'N')},
+    };
+    for (const Case& c : cases) {
+        EXPECT_EQ(StatusNameOf(c.text), c.name) << c.text;
     }
 }
 

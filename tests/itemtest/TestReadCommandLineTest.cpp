@@ -20,7 +20,7 @@ Args With(Args extra) {
 TEST(TestReadCommandLine, ReadsEveryOptionInBothForms) {
     const TestReadCommand command = ParseTestReadCommand(
         With({"--access-path", "Line1", "--count=5", "--interval", "0.5", "--scale", "4:20:0:250.5",
-              "--timeout=2.5", "--plant", "p.json"}));
+              "--timeout=2.5", "--plant", "p.json", "--verbose"}));
     ASSERT_EQ(command.action, Action::Run) << command.error;
     const TestReadOptions& o = command.options;
     EXPECT_EQ(o.nodeAndServer, "\\\\PLANT2\\Sim.Plant.1");
@@ -35,6 +35,7 @@ TEST(TestReadCommandLine, ReadsEveryOptionInBothForms) {
     EXPECT_DOUBLE_EQ(o.scale->engMax, 250.5);
     EXPECT_DOUBLE_EQ(o.timeoutSec.value_or(0), 2.5);
     EXPECT_EQ(o.plantFile, "p.json");
+    EXPECT_TRUE(o.verbose);
 }
 
 TEST(TestReadCommandLine, DefaultsToOneUnscaledValueAtOneSecond) {
@@ -44,6 +45,7 @@ TEST(TestReadCommandLine, DefaultsToOneUnscaledValueAtOneSecond) {
     EXPECT_DOUBLE_EQ(command.options.intervalSec, 1.0);
     EXPECT_FALSE(command.options.scale.has_value());
     EXPECT_FALSE(command.options.timeoutSec.has_value());
+    EXPECT_FALSE(command.options.verbose);
 }
 
 TEST(TestReadCommandLine, RefusesWhatCannotBeRead) {
@@ -55,6 +57,7 @@ TEST(TestReadCommandLine, RefusesWhatCannotBeRead) {
         {{"--item", "X"}, "--test-read and --item are both needed"},
         {{"--test-read", "S"}, "--test-read and --item are both needed"},
         {With({"--count"}), "--count needs a value"},
+        {With({"--verbose=yes"}), "--verbose takes no value"},
         {With({"--count", "0"}), "--count must be a whole number from 1 to 1000000000, not \"0\""},
         {With({"--count", "2.5"}),
          "--count must be a whole number from 1 to 1000000000, not \"2.5\""},
@@ -73,7 +76,7 @@ TEST(TestReadCommandLine, RefusesWhatCannotBeRead) {
          "--scale: each minimum must be at least .05 below its maximum"},
         {With({"--timeout", "0"}), "--timeout must be from 0.1 to 86400 seconds, not \"0\""},
         {With({"--item="}), "--item needs an item ID"},
-        {With({"--verbose"}), "unknown option \"--verbose\""},
+        {With({"--quiet"}), "unknown option \"--quiet\""},
     };
     for (const Case& c : cases) {
         const TestReadCommand command = ParseTestReadCommand(c.args);

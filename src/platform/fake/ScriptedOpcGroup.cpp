@@ -50,7 +50,8 @@ int32_t ScriptedOpcGroup::ItemError(int32_t lServerHandle) const {
 ErrorInfo ScriptedOpcGroup::SyncRead(int16_t, int32_t lNumItems,
                                      const OneBased<int32_t>& ServerHandles,
                                      OneBased<Variant>& Values, OneBased<int32_t>& Errors,
-                                     OneBased<int32_t>& Qualities, OneBased<double>& TimeStamps) {
+                                     OneBased<int32_t>& Qualities, OneBased<double>& TimeStamps,
+                                     OneBased<platform::ValueDetail>& Details) {
     if (ErrorInfo error = script_.Call("SyncRead")) {
         return error;
     }
@@ -61,6 +62,7 @@ ErrorInfo ScriptedOpcGroup::SyncRead(int16_t, int32_t lNumItems,
     Errors = OneBased<int32_t>::Sized(lAnswered);
     Qualities = OneBased<int32_t>::Sized(lAnswered);
     TimeStamps = OneBased<double>::Sized(lAnswered);
+    Details.Clear();
     for (int32_t i = 1; i <= lAnswered; ++i) {
         Errors(i) = ItemError(ServerHandles(i));
         Values(i) = Errors(i) == 0 ? script_.readValue : Variant();

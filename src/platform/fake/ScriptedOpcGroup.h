@@ -29,7 +29,8 @@ class ScriptedOpcGroup : public platform::OPCGroup, public platform::OPCItems {
                        const platform::OneBased<int32_t>& ServerHandles,
                        platform::OneBased<Variant>& Values, platform::OneBased<int32_t>& Errors,
                        platform::OneBased<int32_t>& Qualities,
-                       platform::OneBased<double>& TimeStamps) override;
+                       platform::OneBased<double>& TimeStamps,
+                       platform::OneBased<platform::ValueDetail>& Details) override;
     ErrorInfo SyncWrite(int32_t lNumItems, const platform::OneBased<int32_t>& ServerHandles,
                         const platform::OneBased<Variant>& Values,
                         platform::OneBased<int32_t>& Errors) override;

@@ -8,11 +8,14 @@
 #include "platform/Variant.h"
 #include "platform/opc/OPCItems.h"
 #include "platform/opc/OneBased.h"
+#include "platform/opc/ValueDetail.h"
 
 namespace cv::platform {
 
 // What a group's DataChange event carries: one entry per changed item.
-// Time stamps are OLE dates in local time.
+// Time stamps are OLE dates in local time: the server's time stamp of each
+// value. Details may hold fewer entries than items (none from a Data Access
+// server): an item without one has no detail.
 struct DataChangeArgs {
     int32_t TransactionID = 0;
     int32_t NumItems = 0;
@@ -20,6 +23,7 @@ struct DataChangeArgs {
     OneBased<Variant> ItemValues;
     OneBased<int32_t> Qualities;
     OneBased<double> TimeStamps;
+    OneBased<ValueDetail> Details;
 };
 
 // A group of items on a server. DataChange fires only while the group is
@@ -42,12 +46,13 @@ class OPCGroup {
     virtual platform::OPCItems& OPCItems() = 0;
 
     // Reads lNumItems items from the cache or the device (OpcDataSource).
-    // The four output arrays get one entry per item; an item whose error is
-    // not 0 has no value.
+    // The first four output arrays get one entry per item; an item whose
+    // error is not 0 has no value. Details, as in DataChangeArgs, may stay
+    // shorter.
     virtual ErrorInfo SyncRead(int16_t iSource, int32_t lNumItems,
                                const OneBased<int32_t>& ServerHandles, OneBased<Variant>& Values,
                                OneBased<int32_t>& Errors, OneBased<int32_t>& Qualities,
-                               OneBased<double>& TimeStamps) = 0;
+                               OneBased<double>& TimeStamps, OneBased<ValueDetail>& Details) = 0;
     virtual ErrorInfo SyncWrite(int32_t lNumItems, const OneBased<int32_t>& ServerHandles,
                                 const OneBased<Variant>& Values, OneBased<int32_t>& Errors) = 0;
 

@@ -34,11 +34,23 @@ std::string ConsoleDialogs::PlainLines(const std::string& text) {
     return lines;
 }
 
+std::string ConsoleDialogs::ToldText(const std::string& text, int32_t style) {
+    if ((style & 0xF) == MsgBoxStyle::OKOnly) {
+        return text;
+    }
+    const size_t question = text.rfind("\r\n\r\n");
+    return question == std::string::npos ? std::string() : text.substr(0, question);
+}
+
 int32_t ConsoleDialogs::MsgBox(const std::string& text, int32_t style, const std::string& title) {
+    const std::string told = ToldText(text, style);
+    if (told.empty() && (style & 0xF) != MsgBoxStyle::OKOnly) {
+        return UnattendedAnswer(style);
+    }
     if (!title.empty()) {
         out_ << PlainLines(title) << ":\n";
     }
-    out_ << PlainLines(text) << '\n';
+    out_ << PlainLines(told) << '\n';
     out_.flush();
     return UnattendedAnswer(style);
 }

@@ -43,7 +43,10 @@ ErrorInfo SimGroup::SyncRead(int16_t iSource, int32_t lNumItems,
                              platform::OneBased<Variant>& Values,
                              platform::OneBased<int32_t>& Errors,
                              platform::OneBased<int32_t>& Qualities,
-                             platform::OneBased<double>& TimeStamps) {
+                             platform::OneBased<double>& TimeStamps,
+                             platform::OneBased<platform::ValueDetail>& Details) {
+    // A Data Access server gives one time stamp and no status of its own.
+    Details.Clear();
     const auto state = state_;
     return state->SyncRead(iSource, lNumItems, ServerHandles, Values, Errors, Qualities,
                            TimeStamps);

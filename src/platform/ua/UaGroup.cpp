@@ -42,10 +42,11 @@ ErrorInfo UaGroup::SyncRead(int16_t iSource, int32_t lNumItems,
                             platform::OneBased<Variant>& Values,
                             platform::OneBased<int32_t>& Errors,
                             platform::OneBased<int32_t>& Qualities,
-                            platform::OneBased<double>& TimeStamps) {
+                            platform::OneBased<double>& TimeStamps,
+                            platform::OneBased<platform::ValueDetail>& Details) {
     const auto state = state_;
-    return state->SyncRead(iSource, lNumItems, ServerHandles, Values, Errors, Qualities,
-                           TimeStamps);
+    return state->SyncRead(iSource, lNumItems, ServerHandles, Values, Errors, Qualities, TimeStamps,
+                           Details);
 }
 
 ErrorInfo UaGroup::SyncWrite(int32_t lNumItems, const platform::OneBased<int32_t>& ServerHandles,

@@ -223,6 +223,7 @@ void UaGroupState::OnDataChange(std::vector<ua::MonitoredItemNotification>& valu
         args.ItemValues.Add(ToAutomation(change.value.value));
         args.Qualities.Add(QualityOf(change.value.status));
         args.TimeStamps.Add(TimeStampOf(change.value));
+        args.Details.Add(DetailOf(change.value));
     }
     args.NumItems = args.ClientHandles.Count();
     if (args.NumItems == 0) {

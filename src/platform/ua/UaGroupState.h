@@ -81,7 +81,8 @@ class UaGroupState : public std::enable_shared_from_this<UaGroupState> {
     ErrorInfo SyncRead(int16_t source, int32_t count, const platform::OneBased<int32_t>& handles,
                        platform::OneBased<Variant>& values, platform::OneBased<int32_t>& errors,
                        platform::OneBased<int32_t>& qualities,
-                       platform::OneBased<double>& timeStamps);
+                       platform::OneBased<double>& timeStamps,
+                       platform::OneBased<platform::ValueDetail>& details);
     ErrorInfo SyncWrite(int32_t count, const platform::OneBased<int32_t>& handles,
                         const platform::OneBased<Variant>& values,
                         platform::OneBased<int32_t>& errors);

@@ -179,7 +179,8 @@ ErrorInfo UaGroupState::SetItemActive(UaItemState& item, bool active) {
 
 ErrorInfo UaGroupState::SyncRead(int16_t source, int32_t count, const OneBased<int32_t>& handles,
                                  OneBased<Variant>& values, OneBased<int32_t>& errors,
-                                 OneBased<int32_t>& qualities, OneBased<double>& timeStamps) {
+                                 OneBased<int32_t>& qualities, OneBased<double>& timeStamps,
+                                 OneBased<platform::ValueDetail>& details) {
     std::shared_ptr<UaConnection> connection;
     if (const ErrorInfo error = Connection(connection)) {
         return error;
@@ -193,6 +194,7 @@ ErrorInfo UaGroupState::SyncRead(int16_t source, int32_t count, const OneBased<i
     errors = OneBased<int32_t>::Sized(count);
     qualities = OneBased<int32_t>::Sized(count);
     timeStamps = OneBased<double>::Sized(count);
+    details = OneBased<platform::ValueDetail>::Sized(count);
     std::vector<int32_t> positions;
     std::vector<ua::ReadValueId> nodes;
     for (int32_t i = 1; i <= count; ++i) {
@@ -231,6 +233,7 @@ ErrorInfo UaGroupState::SyncRead(int16_t source, int32_t count, const OneBased<i
         values(i) = ToAutomation(value.value);
         qualities(i) = QualityOf(value.status);
         timeStamps(i) = TimeStampOf(value);
+        details(i) = DetailOf(value);
     }
     return {};
 }

@@ -89,10 +89,11 @@ std::optional<ua::StatusCode> StatusOfHresult(int32_t hresult) {
     if (named != kResults.end()) {
         return ua::StatusCode{named->first};
     }
-    // Bad UA codes have nothing in their low 16 bits once passed on; COM
-    // and Data Access errors do.
+    // UA codes have nothing in their low 16 bits once passed on (bad ones
+    // as results, any as the status behind a value's quality); COM and Data
+    // Access errors do.
     const ua::StatusCode status{static_cast<uint32_t>(hresult)};
-    if (!status.IsBad() || status.WithoutInfoBits() != status) {
+    if (status.code == 0 || status.WithoutInfoBits() != status) {
         return std::nullopt;
     }
     return status;

@@ -27,8 +27,9 @@ int32_t HresultOf(ua::StatusCode status);
 // to read) rather than how good the value is.
 bool IsOperationError(ua::StatusCode status);
 
-// The UA status an HRESULT stands for: a bad code passed on as itself, or
-// the code its Data Access error was made from.
+// The UA status an HRESULT stands for: a code passed on as itself (a bad
+// result, or the status behind a value's quality), or the code its Data
+// Access error was made from.
 std::optional<ua::StatusCode> StatusOfHresult(int32_t hresult);
 
 // The text of an error the backend gives without a UA status behind it

@@ -63,13 +63,22 @@ std::optional<ua::DateTime> UaDateTimeOf(double oleDate) {
 }
 
 double TimeStampOf(const ua::DataValue& value) {
-    if (value.sourceTimestamp.ticks != 0) {
-        return OleDateOf(value.sourceTimestamp);
-    }
     if (value.serverTimestamp.ticks != 0) {
         return OleDateOf(value.serverTimestamp);
     }
+    if (value.sourceTimestamp.ticks != 0) {
+        return OleDateOf(value.sourceTimestamp);
+    }
     return OleDateOf(ua::DateTime::Now());
+}
+
+platform::ValueDetail DetailOf(const ua::DataValue& value) {
+    platform::ValueDetail detail;
+    if (value.sourceTimestamp.ticks != 0) {
+        detail.sourceTimeStamp = OleDateOf(value.sourceTimestamp);
+    }
+    detail.status = value.status.WithoutInfoBits().code;
+    return detail;
 }
 
 }  // namespace cv::uaopc

@@ -1,5 +1,6 @@
 #pragma once
 
+#include "platform/opc/ValueDetail.h"
 #include "ua/types/BuiltinTypes.h"
 #include "ua/types/DataValue.h"
 
@@ -11,8 +12,11 @@ namespace cv::uaopc {
 double OleDateOf(ua::DateTime time);
 // Nothing for a date outside the years 100 to 9999.
 std::optional<ua::DateTime> UaDateTimeOf(double oleDate);
-// A value's time stamp: its source time stamp, else its server time stamp,
+// A value's time stamp: its server time stamp, else its source time stamp,
 // else the time it arrived (now).
 double TimeStampOf(const ua::DataValue& value);
+// What the time stamp and quality leave out: the source time stamp (0 when
+// the server sent none) and the status behind the quality (0 for Good).
+platform::ValueDetail DetailOf(const ua::DataValue& value);
 
 }  // namespace cv::uaopc

@@ -1,5 +1,7 @@
 #include "ui/test/frmDDETest.h"
 
+#include <initializer_list>
+
 #include <QCloseEvent>
 #include <QColorDialog>
 #include <QComboBox>
@@ -36,6 +38,19 @@ QLabel* NewLabel(const char* name, const char* caption = "") {
     auto* label = Named(new QLabel(QString::fromUtf8(caption)), name);
     label->setTextFormat(Qt::PlainText);
     return label;
+}
+
+// A label for text that comes from a server: never read as markup.
+QLabel* NewPlainLabel(const char* name) {
+    QLabel* label = NewLabel(name);
+    label->setTextFormat(Qt::PlainText);
+    return label;
+}
+
+void SetTextColour(QLabel& label, const QColor& colour) {
+    QPalette palette = label.palette();
+    palette.setColor(QPalette::WindowText, colour);
+    label.setPalette(palette);
 }
 
 QString Text(const std::string& text) {
@@ -86,30 +101,37 @@ void frmDDETest::CreateControls() {
     lblInstValue->setTextInteractionFlags(Qt::TextSelectableByMouse);
     lblTimeStampLabel = NewLabel("lblTimeStampLabel", "Server timestamp :");
     lblTimeStamp = NewLabel("lblTimeStamp");
+    lblSourceTimeStampLabel = NewLabel("lblSourceTimeStampLabel", "Source timestamp :");
+    lblSourceTimeStamp = NewLabel("lblSourceTimeStamp");
     auto* grid = new QGridLayout(fraTestItem);
     grid->addWidget(lblDdeLabel, 0, 0, 1, 2);
     grid->addWidget(lblInstLabel, 1, 0);
     grid->addWidget(lblInstValue, 1, 1);
     grid->addWidget(lblTimeStampLabel, 2, 0);
     grid->addWidget(lblTimeStamp, 2, 1);
-    grid->addWidget(CreateEngValueFrame(), 3, 0, 1, 2);
-    grid->addWidget(CreateModeFrame(), 4, 0, 1, 2);
+    grid->addWidget(lblSourceTimeStampLabel, 3, 0);
+    grid->addWidget(lblSourceTimeStamp, 3, 1);
+    grid->addWidget(CreateEngValueFrame(), 4, 0, 1, 2);
+    grid->addWidget(CreateModeFrame(), 5, 0, 1, 2);
     grid->setColumnStretch(1, 1);
-    lblTestResult = NewLabel("lblTestResult", "Test successful");
     lblBackend = NewLabel("lblBackend");
     mcProgress = new ctlProgress(mTest.Progress());
+    lblServerAnswer = NewPlainLabel("lblServerAnswer");
+    lblServerAnswer->setWordWrap(true);
     auto* layout = new QVBoxLayout(this);
     layout->addWidget(fraTestItem);
-    layout->addWidget(lblTestResult);
+    layout->addWidget(CreateStatusRow());
     layout->addWidget(lblBackend);
     layout->addWidget(mcProgress);
+    layout->addWidget(lblServerAnswer);
     layout->addWidget(CreateButtonRow());
     layout->setSizeConstraint(QLayout::SetFixedSize);
-    lblDdeLabel->hide();
-    lblTimeStampLabel->hide();
-    lblTimeStamp->hide();
-    lblTestResult->hide();
-    lblBackend->hide();
+    for (QWidget* hidden :
+         std::initializer_list<QWidget*>{lblDdeLabel, lblTimeStampLabel, lblTimeStamp,
+                                         lblSourceTimeStampLabel, lblSourceTimeStamp, lblTestResult,
+                                         lblQuality, lblOutOfRange, lblBackend, lblServerAnswer}) {
+        hidden->hide();
+    }
     setMinimumWidth(fontMetrics().horizontalAdvance(QLatin1Char('x')) * 60);
 }
 
@@ -177,6 +199,23 @@ QGroupBox* frmDDETest::CreateModeFrame() {
     return fraModeSelect;
 }
 
+QWidget* frmDDETest::CreateStatusRow() {
+    auto* row = new QWidget();
+    lblTestResult = NewLabel("lblTestResult", "Test successful");
+    lblQuality = NewPlainLabel("lblQuality");
+    lblOutOfRange = NewLabel("lblOutOfRange");
+    QFont bold = lblOutOfRange->font();
+    bold.setBold(true);
+    lblOutOfRange->setFont(bold);
+    auto* layout = new QHBoxLayout(row);
+    layout->setContentsMargins(0, 0, 0, 0);
+    layout->addWidget(lblTestResult);
+    layout->addWidget(lblQuality);
+    layout->addWidget(lblOutOfRange);
+    layout->addStretch();
+    return row;
+}
+
 QWidget* frmDDETest::CreateButtonRow() {
     auto* row = new QWidget();
     cmdClose = Named(new QPushButton(QStringLiteral("&Close")), "cmdClose");
@@ -208,10 +247,12 @@ void frmDDETest::DisplayChanged() {
     lblTimeStamp->setToolTip(Text(shown.timeStamp));
     lblTimeStampLabel->setVisible(shown.showTimeStamp);
     lblTimeStamp->setVisible(shown.showTimeStamp);
+    lblSourceTimeStamp->setText(Text(shown.sourceTimeStamp));
+    const bool bSourceStamp = shown.showTimeStamp && !shown.sourceTimeStamp.empty();
+    lblSourceTimeStampLabel->setVisible(bSourceStamp);
+    lblSourceTimeStamp->setVisible(bSourceStamp);
     lblEngValue->setText(Text(shown.engValue));
-    QPalette palette = lblEngValue->palette();
-    palette.setColor(QPalette::WindowText, ToQColor(shown.engColor));
-    lblEngValue->setPalette(palette);
+    SetTextColour(*lblEngValue, ToQColor(shown.engColor));
     // The box keeps what the user types until the test takes a new number.
     if (shown.decimalPlaces != msPlacesShown) {
         msPlacesShown = shown.decimalPlaces;
@@ -221,12 +262,27 @@ void frmDDETest::DisplayChanged() {
     ShowModes();
     lblTestResult->setText(Text(shown.testResult));
     lblTestResult->setVisible(shown.showTestResult);
+    ShowQuality();
+    lblServerAnswer->setText(Text(shown.serverAnswer));
+    lblServerAnswer->setVisible(!shown.serverAnswer.empty());
     lblBackend->setText(Text("Backend: " + shown.backend));
     lblBackend->setVisible(!shown.backend.empty());
     if (shown.mousePointer != miPointerShown) {
         miPointerShown = shown.mousePointer;
         SetControlsBusy(miPointerShown, *this);
     }
+}
+
+// Beside "Test successful", which the designed window always shows.
+void frmDDETest::ShowQuality() {
+    const ItemTestDisplay& shown = mTest.Display();
+    lblQuality->setText(Text("Quality: " + shown.quality));
+    lblQuality->setToolTip(lblQuality->text());
+    SetTextColour(*lblQuality, ToQColor(shown.qualityColor));
+    lblQuality->setVisible(shown.showTestResult && !shown.quality.empty());
+    lblOutOfRange->setText(Text(shown.rangeMark));
+    SetTextColour(*lblOutOfRange, ToQColor(ItemTestDisplay::kBadColor));
+    lblOutOfRange->setVisible(shown.showEngValue && shown.outOfRange);
 }
 
 void frmDDETest::ShowModes() {

@@ -47,7 +47,9 @@ class frmDDETest : public QDialog, private ItemTest::Listener {
     void CreateControls();
     QGroupBox* CreateEngValueFrame();
     QGroupBox* CreateModeFrame();
+    QWidget* CreateStatusRow();
     QWidget* CreateButtonRow();
+    void ShowQuality();
     void DisplayChanged() override;
     void CloseRequested() override;
     void ShowModes();
@@ -69,6 +71,9 @@ class frmDDETest : public QDialog, private ItemTest::Listener {
     QLabel* lblInstValue = nullptr;
     QLabel* lblTimeStampLabel = nullptr;
     QLabel* lblTimeStamp = nullptr;
+    // The value's source time stamp, where the server sends one.
+    QLabel* lblSourceTimeStampLabel = nullptr;
+    QLabel* lblSourceTimeStamp = nullptr;
     QGroupBox* fraEngValue = nullptr;
     QLabel* lblEngLabel = nullptr;
     QLabel* lblEngValue = nullptr;
@@ -83,6 +88,12 @@ class frmDDETest : public QDialog, private ItemTest::Listener {
     QLabel* Label2 = nullptr;
     QPushButton* cmdApply = nullptr;
     QLabel* lblTestResult = nullptr;
+    // Beside the test result: the value's quality, and a mark while the
+    // engineering value is outside the engineering range.
+    QLabel* lblQuality = nullptr;
+    QLabel* lblOutOfRange = nullptr;
+    // Under the wait progress: what the server answered last.
+    QLabel* lblServerAnswer = nullptr;
     // Which kind of server answered, once known.
     QLabel* lblBackend = nullptr;
     ctlProgress* mcProgress = nullptr;

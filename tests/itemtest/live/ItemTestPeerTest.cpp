@@ -66,17 +66,24 @@ struct ItemTestPeer : LiveUaTest, ItemTest::Listener {
     int refreshes = 0;
 };
 
+// The quality carries the server's own name for its status; both time
+// stamps are shown.
 TEST_F(ItemTestPeer, ValuesOfEachQualityAndTheBackendAreShown) {
     struct Case {
         std::string path;
         bool shown;  // else the test closes with its diagnosis
         std::string instValue;
         std::string said;
+        std::string quality;
     };
     const Case cases[] = {
-        {"Plant.Area1.FIC101.PV", true, "42.5", ""},
-        {"Quality.Uncertain", true, "12.5", "Quality.Uncertain: Uncertain OPC Value"},
-        {"Quality.Bad_DeviceFailure", false, "", "Device failure"},
+        {"Plant.Area1.FIC101.PV", true, "42.5", "", "good"},
+        {"Quality.Uncertain", true, "12.5", "Quality.Uncertain: Uncertain OPC Value",
+         "uncertain (Uncertain)"},
+        {"Quality.Uncertain_SensorNotAccurate", true, "12.5", "",
+         "uncertain, sensor not accurate (Uncertain_SensorNotAccurate)"},
+        {"Quality.Bad_DeviceFailure", false, "", "Device failure",
+         "bad, device failure (Bad_DeviceFailure)"},
     };
     for (const Case& c : cases) {
         lp.dialogs.QueueAnswer(MsgBoxResult::Yes);
@@ -86,8 +93,11 @@ TEST_F(ItemTestPeer, ValuesOfEachQualityAndTheBackendAreShown) {
         ASSERT_TRUE(WaitUntil([&] { return refreshes > 0 || closes > 0; })) << c.path;
         EXPECT_EQ(refreshes > 0, c.shown) << c.path;
         EXPECT_EQ(itemTest->Display().backend, "OPC UA") << c.path;
+        EXPECT_EQ(itemTest->Display().quality, c.quality) << c.path;
+        EXPECT_FALSE(itemTest->Display().timeStamp.empty()) << c.path;
         if (c.shown) {
             EXPECT_EQ(itemTest->Display().instValue, c.instValue) << c.path;
+            EXPECT_FALSE(itemTest->Display().sourceTimeStamp.empty()) << c.path;
         }
         if (!c.said.empty()) {
             EXPECT_TRUE(Said(c.said)) << c.path;

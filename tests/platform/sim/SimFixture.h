@@ -21,6 +21,7 @@ using platform::DataChangeArgs;
 using platform::OneBased;
 using platform::OPCGroup;
 using platform::OPCServer;
+using platform::ValueDetail;
 
 // 2025-01-01 00:00 local time: the plant's clock starts here in tests.
 inline constexpr double kStartDate = 45658.0;
@@ -76,10 +77,12 @@ struct SimFixture : ::testing::Test {
         OneBased<int32_t> errors;
         OneBased<int32_t> qualities;
         OneBased<double> stamps;
+        OneBased<ValueDetail> details;
         Read read;
-        read.call =
-            group.SyncRead(source, 1, OneBased<int32_t>{handle}, values, errors, qualities, stamps);
+        read.call = group.SyncRead(source, 1, OneBased<int32_t>{handle}, values, errors, qualities,
+                                   stamps, details);
         if (!read.call) {
+            EXPECT_EQ(details.Count(), 0) << "a Data Access server tells no more";
             read = {{}, values(1), errors(1), qualities(1), stamps(1)};
         }
         return read;

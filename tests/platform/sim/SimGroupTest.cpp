@@ -71,10 +71,14 @@ TEST_F(SimGroupTest, CallsWithCountsTheArraysDoNotHoldAreRefused) {
     OneBased<Variant> values;
     OneBased<int32_t> errors, qualities, handles;
     OneBased<double> stamps;
+    OneBased<ValueDetail> details;
     const OneBased<int32_t> one({1});
-    EXPECT_EQ(group->SyncRead(2, 0, one, values, errors, qualities, stamps).Number, E_INVALIDARG);
-    EXPECT_EQ(group->SyncRead(2, 2, one, values, errors, qualities, stamps).Number, E_INVALIDARG);
-    EXPECT_EQ(group->SyncRead(3, 1, one, values, errors, qualities, stamps).Number, E_INVALIDARG);
+    EXPECT_EQ(group->SyncRead(2, 0, one, values, errors, qualities, stamps, details).Number,
+              E_INVALIDARG);
+    EXPECT_EQ(group->SyncRead(2, 2, one, values, errors, qualities, stamps, details).Number,
+              E_INVALIDARG);
+    EXPECT_EQ(group->SyncRead(3, 1, one, values, errors, qualities, stamps, details).Number,
+              E_INVALIDARG);
     EXPECT_EQ(group->SyncWrite(1, one, OneBased<Variant>(), errors).Number, E_INVALIDARG);
     EXPECT_EQ(
         group->OPCItems()

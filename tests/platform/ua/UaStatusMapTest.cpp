@@ -83,6 +83,9 @@ TEST(UaStatusMap, AnErrorLeadsBackToTheStatusItCameFrom) {
     EXPECT_EQ(StatusOfHresult(OPC_E_UNKNOWNITEMID), (ua::StatusCode{0x80340000}));
     EXPECT_EQ(StatusOfHresult(OPC_E_BADRIGHTS), (ua::StatusCode{0x803A0000}));
     EXPECT_EQ(StatusOfHresult(platform::Hresult(0x808C0000)), (ua::StatusCode{0x808C0000}));
+    // The status behind a value's quality, which GetErrorString names.
+    EXPECT_EQ(StatusOfHresult(0x40930000), (ua::StatusCode{0x40930000}));
+    EXPECT_EQ(StatusOfHresult(0x00960000), (ua::StatusCode{0x00960000}));
     for (const int32_t other : {0, E_FAIL, RPC_E_DISCONNECTED, OPC_E_INVALIDHANDLE, 13}) {
         EXPECT_FALSE(StatusOfHresult(other)) << std::hex << other;
     }

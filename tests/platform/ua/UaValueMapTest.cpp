@@ -134,12 +134,19 @@ TEST_F(UaValueMap, TimesGoToLocalDatesAndBackToTheMillisecond) {
     EXPECT_FALSE(UaDateTimeOf(kOleDateMin - 2));
 }
 
-TEST_F(UaValueMap, ATimeStampIsTheSourcesElseTheServers) {
+// The time stamp is the server's, else the source's; the source's goes
+// beside it with the status behind the quality.
+TEST_F(UaValueMap, ATimeStampIsTheServersElseTheSourcesWhichTheDetailCarries) {
     ua::DataValue value;
-    value.serverTimestamp = kSummer;
-    EXPECT_EQ(TimeStampOf(value), Local(2024, 7, 1, 14, 250));
     value.sourceTimestamp = kWinter;
+    value.status = ua::StatusCode{0x40930000 | 0x0400};
     EXPECT_EQ(TimeStampOf(value), Local(2024, 1, 2, 7));
+    EXPECT_EQ(DetailOf(value), (platform::ValueDetail{Local(2024, 1, 2, 7), 0x40930000}));
+    value.serverTimestamp = kSummer;
+    value.sourceTimestamp = {};
+    value.status = {};
+    EXPECT_EQ(TimeStampOf(value), Local(2024, 7, 1, 14, 250));
+    EXPECT_EQ(DetailOf(value), platform::ValueDetail{});
 }
 
 }  // namespace

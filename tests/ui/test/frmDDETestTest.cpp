@@ -90,7 +90,11 @@ class frmDDETestTest : public QObject {
         QCOMPARE(Text("lblInstValue"), QString("12"));
         QCOMPARE(Find("lblInstValue")->toolTip(), QString("12"));
         QCOMPARE(Text("lblEngValue"), QString("50.00"));
-        QCOMPARE(Text("lblTimeStamp"), QString("12:00:00 AM  1/1/2025"));
+        QCOMPARE(Text("lblTimeStamp"), QString("12:00:00.000 AM  1/1/2025"));
+        QVERIFY(!Find("lblSourceTimeStamp")->isVisible());
+        QCOMPARE(Text("lblQuality"), QString("Quality: good"));
+        QVERIFY(Find("lblQuality")->isVisible());
+        QVERIFY(!Find("lblOutOfRange")->isVisible());
         QCOMPARE(Text("lblInstLabel"), QString("Raw Instrument value :"));
         QCOMPARE(Text("lblBackend"), QString("Backend: simulated plant"));
         QVERIFY(Find("lblBackend")->isVisible());
@@ -125,30 +129,61 @@ class frmDDETestTest : public QObject {
         QVERIFY(window->isVisible());
     }
 
+    // Under the progress bar, what the server answered while the test tries
+    // again; until the wait ends, or at once when no retry can help.
     void failuresShowTheirDiagnosisAndClose_data() {
         QTest::addColumn<QString>("server");
         QTest::addColumn<QString>("item");
         QTest::addColumn<QString>("text");
+        QTest::addColumn<QString>("answer");
         QTest::newRow("bad quality") << kPlant << "Quality.CommFailure"
-                                     << "Communications failure";
+                                     << "Communications failure"
+                                     << "The server answered: bad, communication failure; trying "
+                                        "again until the wait ends";
         QTest::newRow("unknown item") << kPlant << "No.Such.Item"
-                                      << "Either the Access Path or the Item Name are unknown";
+                                      << "Either the Access Path or the Item Name are unknown"
+                                      << "The server answered: Either the Access Path or the Item "
+                                         "Name are unknown to the OPC Server; trying again until "
+                                         "the wait ends";
         QTest::newRow("not registered") << "Sim.Nothing.1"
                                         << "X"
-                                        << "is not registered as an OPC Server in this computer.";
+                                        << "is not registered as an OPC Server in this computer."
+                                        << "";
     }
     void failuresShowTheirDiagnosisAndClose() {
         QFETCH(QString, server);
         QFETCH(QString, item);
         QFETCH(QString, text);
+        QFETCH(QString, answer);
         Open(server.toStdString(), item.toStdString());
-        Advance(5000);
-        QVERIFY(window->isVisible());
-        Advance(5300);
+        Advance(answer.isEmpty() ? 100 : 5000);
+        QCOMPARE(window->isVisible(), !answer.isEmpty());
+        QCOMPARE(Find("lblServerAnswer")->isVisible(), !answer.isEmpty());
+        QCOMPARE(Text("lblServerAnswer"), answer);
+        Advance(answer.isEmpty() ? 0 : 5300);
         QVERIFY(!window->isVisible());
         QVERIFY(!Messages().empty());
         QVERIFY2(QString::fromStdString(tp->dialogs.Last().text).contains(text),
                  tp->dialogs.Last().text.c_str());
+    }
+
+    // Beside "Test successful": the quality, bad here although the value is
+    // shown (a last known value), and a mark outside the engineering range.
+    void qualityAndRangeShowBesideTheResult() {
+        tp->run.UncertainWarningOff = true;
+        doc->General().SetScalePVandCO(true);
+        doc->General().SetScaleSP(true);
+        Channel().SetRange(cv::RangeType::Instrument, 0, 10);
+        Channel().SetRange(cv::RangeType::Engineering, 0, 10);
+        Open(kPlant, "Quality.LastKnown");
+        Advance(2000);
+        QCOMPARE(Text("lblTestResult"), QString("Test successful"));
+        QCOMPARE(Text("lblQuality"), QString("Quality: bad, last known value"));
+        QCOMPARE(Find("lblQuality")->palette().color(QPalette::WindowText), QColor(0xC0, 0, 0));
+        QVERIFY(Find("lblOutOfRange")->isVisible());
+        QCOMPARE(Text("lblOutOfRange"), QString("out of range 0.00 to 10.00"));
+        QCOMPARE(Text("lblEngValue"), QString("13.00"));
+        QVERIFY(Messages().empty());
     }
 
     void theSlowServerShowsItsBusyNotice() {

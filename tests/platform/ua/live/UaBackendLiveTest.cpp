@@ -97,8 +97,10 @@ TEST_F(LiveUaTest, DeviceReadsGiveQualitiesAndItemsTheirErrors) {
     OneBased<int32_t> readErrors;
     OneBased<int32_t> qualities;
     OneBased<double> stamps;
+    OneBased<platform::ValueDetail> details;
     ASSERT_FALSE(group->SyncRead(platform::OpcDataSource::Device, added.Count(), added, values,
-                                 readErrors, qualities, stamps));
+                                 readErrors, qualities, stamps, details));
+    ASSERT_EQ(details.Count(), added.Count());
     for (int32_t i = 1; i <= added.Count(); ++i) {
         EXPECT_EQ(readErrors(i), 0) << rows[i - 1].itemId;
         EXPECT_EQ(qualities(i), rows[i - 1].quality) << rows[i - 1].itemId;
