@@ -1,7 +1,9 @@
 #include <gtest/gtest.h>
 
 #include <algorithm>
+#include <deque>
 #include <map>
+#include <optional>
 #include <set>
 
 #include "ua/ScriptedServer.h"
@@ -74,9 +76,34 @@ class PublishScript {
     size_t next_ = 0;
 };
 
+// Answers the first count Publish requests as they come, each with a data
+// message that says whether the server has more; holds the rest.
+ScriptedServer::Script AnswerAtOnce(uint32_t count, bool more) {
+    return [count, more, answered = 0u](ScriptedServer& server, const Request& request) mutable {
+        if (request.typeId != PublishRequest::kEncodingId) {
+            return false;
+        }
+        if (answered < count) {
+            ++answered;
+            PublishResponse response;
+            response.subscriptionId = 1;
+            response.moreNotifications = more;
+            response.notificationMessage = DataMessage(answered, answered);
+            server.Reply(request, response);
+        }
+        return true;
+    };
+}
+
+PublishResponse Refusal(StatusCode status) {
+    PublishResponse response;
+    response.header.serviceResult = status;
+    return response;
+}
+
 class ScriptedSubscription : public ::testing::Test {
   protected:
-    void Start(PublishScript script) {
+    void Start(ScriptedServer::Script script, SubscriptionSettings settings = {}) {
         server_ = std::make_unique<ScriptedServer>(std::move(script));
         client_ = std::make_unique<Client>(queue_.MakeDispatcher());
         ASSERT_TRUE(
@@ -93,7 +120,18 @@ class ScriptedSubscription : public ::testing::Test {
             statuses_.push_back(status);
         };
         ASSERT_TRUE(Await<SubscriptionInfo>(
-            queue_, [&](auto done) { client_->CreateSubscription({}, handlers, done); }));
+            queue_, [&](auto done) { client_->CreateSubscription(settings, handlers, done); }));
+    }
+
+    uint32_t OutstandingPublishes() {
+        std::optional<Client::Statistics> statistics;
+        client_->GetStatistics([&statistics](Client::Statistics s) { statistics = s; });
+        queue_.RunUntil([&statistics] { return statistics.has_value(); });
+        return statistics ? statistics->outstandingPublishes : 0;
+    }
+
+    static std::vector<SubscriptionAcknowledgement> AcknowledgedBy(const Request& request) {
+        return request.As<PublishRequest>().subscriptionAcknowledgements;
     }
 
     static std::set<uint32_t> Acknowledged(const std::vector<Request>& requests) {
@@ -139,8 +177,9 @@ TEST_F(ScriptedSubscription, AKeepAliveRevealsAGapAndALostMessageIsReported) {
     EXPECT_EQ(statuses_[0].status, status::BadMessageNotAvailable);
     EXPECT_NE(statuses_[0].text.find("message 2"), std::string::npos) << statuses_[0].text;
     EXPECT_EQ(server_->Received(RepublishRequest::kEncodingId).size(), 1u);
-    ASSERT_TRUE(server_->WaitForRequests(PublishRequest::kEncodingId, 6));
-    EXPECT_EQ(Acknowledged(server_->Received(PublishRequest::kEncodingId)), std::set<uint32_t>{1});
+    EXPECT_TRUE(server_->WaitUntil([](const std::vector<Request>& requests) {
+        return Acknowledged(requests) == std::set<uint32_t>{1};
+    }));
 }
 
 TEST_F(ScriptedSubscription, ReportsASubscriptionThatExpiredOnTheServer) {
@@ -149,6 +188,99 @@ TEST_F(ScriptedSubscription, ReportsASubscriptionThatExpiredOnTheServer) {
     EXPECT_EQ(statuses_[0].status, status::BadTimeout);
     EXPECT_NE(statuses_[0].text.find("expired"), std::string::npos);
     EXPECT_EQ(values_, (std::vector<double>{1.0}));
+}
+
+// The client starts with four Publish requests at the server and keeps one
+// more for each answer that shows the server sending faster than it is asked:
+// it has more notifications, or it answered a data message within half a
+// publishing interval. Five answers come at once here.
+TEST_F(ScriptedSubscription, KeepsMorePublishRequestsWhileTheServerSendsFasterThanItIsAsked) {
+    struct Case {
+        const char* name;
+        bool moreNotifications;
+        double intervalMs;
+        uint32_t held;
+    };
+    // At once is never within half of a microsecond, always within half an hour.
+    const Case cases[] = {
+        {"more notifications", true, 0.001, 9},
+        {"answered within half an interval", false, 3'600'000, 9},
+        {"neither", false, 0.001, 4},
+    };
+    for (const Case& c : cases) {
+        SCOPED_TRACE(c.name);
+        values_.clear();
+        SubscriptionSettings settings;
+        settings.publishingIntervalMs = c.intervalMs;
+        Start(AnswerAtOnce(5, c.moreNotifications), settings);
+        ASSERT_TRUE(queue_.RunUntil([&] { return values_.size() == 5; }));
+        EXPECT_EQ(OutstandingPublishes(), c.held);
+        ASSERT_TRUE(server_->WaitForRequests(PublishRequest::kEncodingId, 5 + c.held));
+        EXPECT_EQ(server_->Received(PublishRequest::kEncodingId).size(), 5 + c.held);
+        client_.reset();
+    }
+}
+
+// A server that holds three requests at most answers the oldest with
+// Bad_TooManyPublishRequests when a fourth comes. The client keeps three from
+// then on, also when the server has more notifications.
+TEST_F(ScriptedSubscription, KeepsNoMorePublishRequestsThanTheServerTakes) {
+    Start([held = std::deque<Request>()](ScriptedServer& server, const Request& request) mutable {
+        if (request.typeId != PublishRequest::kEncodingId) {
+            return false;
+        }
+        held.push_back(request);
+        if (held.size() == 4) {
+            server.Reply(held.front(), Refusal(status::BadTooManyPublishRequests));
+            held.pop_front();
+            PublishResponse response;
+            response.subscriptionId = 1;
+            response.moreNotifications = true;
+            response.notificationMessage = DataMessage(1, 1.0);
+            server.Reply(held.front(), response);
+            held.pop_front();
+        }
+        return true;
+    });
+    ASSERT_TRUE(queue_.RunUntil([&] { return values_.size() == 1; }));
+    EXPECT_EQ(OutstandingPublishes(), 3u);
+    ASSERT_TRUE(server_->WaitForRequests(PublishRequest::kEncodingId, 5));
+    EXPECT_EQ(server_->Received(PublishRequest::kEncodingId).size(), 5u);
+    EXPECT_TRUE(statuses_.empty());
+}
+
+// The request that replaces an answered one leaves before the answer's
+// notifications are handed on: it cannot acknowledge them yet; the next one
+// does.
+TEST_F(ScriptedSubscription, SendsTheNextPublishBeforeHandingOnTheNotifications) {
+    SubscriptionSettings settings;
+    settings.publishingIntervalMs = 0.001;
+    Start(
+        [held = std::vector<Request>()](ScriptedServer& server, const Request& request) mutable {
+            if (request.typeId != PublishRequest::kEncodingId) {
+                return false;
+            }
+            held.push_back(request);
+            if (held.size() == 1) {
+                PublishResponse response;
+                response.subscriptionId = 1;
+                response.notificationMessage = DataMessage(1, 1.0);
+                server.Reply(request, response);
+            } else if (held.size() == 5) {
+                PublishResponse response;
+                response.subscriptionId = 1;
+                response.notificationMessage = KeepAlive(2);
+                server.Reply(held[1], response);
+            }
+            return true;
+        },
+        settings);
+    ASSERT_TRUE(server_->WaitForRequests(PublishRequest::kEncodingId, 6));
+    const auto requests = server_->Received(PublishRequest::kEncodingId);
+    EXPECT_TRUE(AcknowledgedBy(requests[4]).empty());
+    ASSERT_EQ(AcknowledgedBy(requests[5]).size(), 1u);
+    EXPECT_EQ(AcknowledgedBy(requests[5])[0].sequenceNumber, 1u);
+    ASSERT_TRUE(queue_.RunUntil([&] { return values_.size() == 1; }));
 }
 
 }  // namespace

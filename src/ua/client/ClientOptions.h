@@ -28,8 +28,12 @@ struct ClientOptions {
     // How often an idle session reads the server's state (at least three
     // times per session time-out).
     uint32_t keepAliveIntervalMs = 5'000;
-    // Publish requests kept at the server while subscriptions exist.
+    // Publish requests kept at the server while subscriptions exist, at
+    // first. One more is kept each time the server has more notifications
+    // than it could send or answers a request at once, up to
+    // maxPublishRequests (fewer once the server refuses more).
     uint32_t publishRequests = 4;
+    uint32_t maxPublishRequests = 100;
     // A connection that breaks is opened again and the session resumed on
     // it, for as long as the server keeps the session (its revised session
     // time-out, counted from the break).

@@ -1,6 +1,7 @@
 #include "ua/client/SubscriptionEngine.h"
 
 #include <algorithm>
+#include <limits>
 
 namespace cv::ua {
 namespace {
@@ -22,7 +23,9 @@ SubscriptionEngine::SubscriptionEngine(asio::io_context& io, std::shared_ptr<Ses
       options_(options),
       deliver_(std::move(deliver)),
       retryTimer_(io),
-      target_(std::max(1u, options.publishRequests)) {}
+      limit_(std::max(1u, options.maxPublishRequests)) {
+    target_ = std::clamp(options.publishRequests, 1u, limit_);
+}
 
 void SubscriptionEngine::Create(const SubscriptionSettings& settings, SubscriptionHandlers handlers,
                                 std::function<void(Result<SubscriptionInfo>)> done) {
@@ -137,8 +140,8 @@ void SubscriptionEngine::Publish() {
     // the next one.
     session_->Call<PublishRequest, PublishResponse>(
         request,
-        [weak = weak_from_this(),
-         acknowledged = request.subscriptionAcknowledgements](Result<PublishResponse> response) {
+        [weak = weak_from_this(), acknowledged = request.subscriptionAcknowledgements,
+         sent = std::chrono::steady_clock::now()](Result<PublishResponse> response) {
             auto self = weak.lock();
             if (!self) {
                 return;
@@ -147,7 +150,7 @@ void SubscriptionEngine::Publish() {
                 self->acknowledgements_.insert(self->acknowledgements_.end(), acknowledged.begin(),
                                                acknowledged.end());
             }
-            self->OnPublish(std::move(response));
+            self->OnPublish(std::move(response), sent);
         },
         PublishTimeoutMs());
 }
@@ -161,25 +164,56 @@ void SubscriptionEngine::RetryLater() {
     });
 }
 
-void SubscriptionEngine::OnPublish(Result<PublishResponse> response) {
+void SubscriptionEngine::OnPublish(Result<PublishResponse> response, TimePoint sent) {
     --outstanding_;
     if (stopped_) {
         return;
     }
     if (!response) {
-        const StatusCode status = response.Failure().status;
-        if (status == status::BadTooManyPublishRequests) {
-            target_ = std::max(1u, outstanding_);
-        } else if (status == status::BadTimeout) {
-            Fill();
-        } else if (session_->IsActive() && outstanding_ == 0) {
-            RetryLater();
-        }
+        OnPublishFailed(response.Failure().status);
         return;
     }
     PublishResponse& publish = response.Value();
-    Process(publish.subscriptionId, std::move(publish.notificationMessage), false);
+    if (ServerWaitsForUs(publish, sent)) {
+        target_ = std::min(limit_, target_ + 1);
+    }
+    // The server gets its next request before the notifications are handed
+    // on; it acknowledges nothing yet, the acknowledgement goes with the
+    // request after.
     Fill();
+    Process(publish.subscriptionId, std::move(publish.notificationMessage), false);
+}
+
+void SubscriptionEngine::OnPublishFailed(StatusCode status) {
+    if (status == status::BadTooManyPublishRequests) {
+        // The server holds as many as it takes.
+        limit_ = std::max(1u, outstanding_);
+        target_ = std::min(target_, limit_);
+    } else if (status == status::BadTimeout) {
+        Fill();
+    } else if (session_->IsActive() && outstanding_ == 0) {
+        RetryLater();
+    }
+}
+
+// The server has more notifications than it could send in this answer, or
+// answered a data message within half a publishing interval of the request:
+// it sends faster than one message per interval and is kept waiting unless
+// more requests are at hand.
+bool SubscriptionEngine::ServerWaitsForUs(const PublishResponse& publish, TimePoint sent) const {
+    if (publish.moreNotifications) {
+        return true;
+    }
+    if (publish.notificationMessage.IsKeepAlive() || subscriptions_.empty()) {
+        return false;
+    }
+    double shortest = std::numeric_limits<double>::max();
+    for (const auto& [id, subscription] : subscriptions_) {
+        shortest = std::min(shortest, subscription.info.revisedPublishingIntervalMs);
+    }
+    const std::chrono::duration<double, std::milli> waited =
+        std::chrono::steady_clock::now() - sent;
+    return waited.count() < shortest / 2;
 }
 
 void SubscriptionEngine::Process(uint32_t subscriptionId, NotificationMessage message,

@@ -287,6 +287,7 @@ void Decoder::VariantScalar(BuiltinType type, Variant& v) {
             return;
         }
         case BuiltinType::Variant:
+            v = Variant();
             Fail("a variant holds a variant outside an array");
             return;
         case BuiltinType::DiagnosticInfo: {
@@ -299,20 +300,24 @@ void Decoder::VariantScalar(BuiltinType type, Variant& v) {
 }
 
 void Decoder::operator()(Variant& v) {
-    v = Variant();
     if (!Enter()) {
+        v = Variant();
         return;
     }
     const uint8_t mask = Byte();
     const uint8_t typeId = mask & 0x3F;
+    // A scalar is assigned once, by VariantScalar; every other way starts
+    // from null.
+    if (typeId <= kMaxBuiltinType && (mask & 0xC0) == 0) {
+        VariantScalar(static_cast<BuiltinType>(typeId), v);
+        Leave();
+        return;
+    }
+    v = Variant();
     if (typeId > kMaxBuiltinType) {
         Fail("a variant has the unknown type " + std::to_string(typeId));
     } else if ((mask & 0x80) == 0) {
-        if (mask & 0x40) {
-            Fail("a scalar variant has array dimensions");
-        } else {
-            VariantScalar(static_cast<BuiltinType>(typeId), v);
-        }
+        Fail("a scalar variant has array dimensions");
     } else if (typeId == 0) {
         Fail("a variant holds an array of null values");
     } else {
@@ -348,13 +353,22 @@ void Decoder::operator()(Variant& v) {
 }
 
 void Decoder::operator()(DataValue& v) {
-    v = {};
+    // Field by field: most values come fresh from an array, and resetting a
+    // whole value would assign its variant twice.
+    v.status = {};
+    v.sourceTimestamp = {};
+    v.serverTimestamp = {};
+    v.sourcePicoseconds = 0;
+    v.serverPicoseconds = 0;
     if (!Enter()) {
+        v.value = Variant();
         return;
     }
     const uint8_t mask = Byte();
     if (mask & 0x01) {
         (*this)(v.value);
+    } else {
+        v.value = Variant();
     }
     if (mask & 0x02) {
         Raw(v.status.code);

@@ -128,6 +128,12 @@ struct SubscriptionAcknowledgement {
 };
 
 struct MonitoredItemNotification {
+    // Not defaulted: a decoded array makes a thousand of these at a time,
+    // and a defaulted constructor would have each zero-filled first.
+    MonitoredItemNotification() {}
+    MonitoredItemNotification(uint32_t handle, DataValue dataValue)
+        : clientHandle(handle), value(std::move(dataValue)) {}
+
     uint32_t clientHandle = 0;
     DataValue value;
 
