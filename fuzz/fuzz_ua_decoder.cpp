@@ -2,7 +2,8 @@
 // the path, the rest is a received byte stream (cut into frames, joined into
 // messages, decoded as every response the client knows) or one encoded
 // value. Checks that what decodes encodes to a form that decodes to the
-// same encoding again.
+// same encoding again, and that the memory a decoded value was charged is
+// the least it decodes with.
 
 #include <cstdint>
 #include <cstdlib>
@@ -35,8 +36,25 @@ DecodeLimits Limits() {
     DecodeLimits limits;
     limits.maxStringLength = 1u << 16;
     limits.maxArrayLength = 1u << 16;
-    limits.maxAllocation = 64u << 20;
+    limits.maxAllocation = 1u << 20;
     return limits;
+}
+
+// One byte less than a value was charged refuses it.
+template <class T>
+void CheckCharge(std::string_view bytes) {
+    Decoder decoder(bytes, Limits());
+    T value{};
+    decoder(value);
+    if (!decoder.Ok() || decoder.Allocated() == 0) {
+        return;
+    }
+    DecodeLimits tighter = Limits();
+    tighter.maxAllocation = decoder.Allocated() - 1;
+    Decoder refused(bytes, tighter);
+    T again{};
+    refused(again);
+    Check(refused.Failure().status == status::BadEncodingLimitsExceeded);
 }
 
 template <class T>
@@ -49,6 +67,7 @@ void RoundTrip(std::string_view bytes) {
     auto again = Decode<T>(encoded, Limits());
     Check(again.Ok());
     Check(Encode(again.Value()) == encoded);
+    CheckCharge<T>(bytes);
 }
 
 template <class... Responses>

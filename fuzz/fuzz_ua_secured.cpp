@@ -82,7 +82,7 @@ DecodeLimits Limits() {
     DecodeLimits limits;
     limits.maxStringLength = 1u << 16;
     limits.maxArrayLength = 1u << 16;
-    limits.maxAllocation = 64u << 20;
+    limits.maxAllocation = 1u << 20;
     return limits;
 }
 
