@@ -2,14 +2,16 @@
 // the path, the rest is a received byte stream (cut into frames, joined into
 // messages, decoded as every response the client knows) or one encoded
 // value. Checks that what decodes encodes to a form that decodes to the
-// same encoding again, and that the memory a decoded value was charged is
-// the least it decodes with.
+// same encoding again, that the memory a decoded value was charged is the
+// least it decodes with, and that a decoded value survives the mapping to
+// the automation interface (a ByteString as one buffer that maps back).
 
 #include <cstdint>
 #include <cstdlib>
 #include <string>
 #include <string_view>
 
+#include "platform/ua/UaValueMap.h"
 #include "ua/encoding/Decoder.h"
 #include "ua/encoding/Encoder.h"
 #include "ua/secure/ChunkAssembler.h"
@@ -70,6 +72,24 @@ void RoundTrip(std::string_view bytes) {
     CheckCharge<T>(bytes);
 }
 
+void Map(std::string_view bytes) {
+    auto decoded = Decode<Variant>(bytes, Limits());
+    if (!decoded) {
+        return;
+    }
+    const cv::Variant mapped = cv::uaopc::ToAutomation(decoded.Value());
+    const ByteString* value = decoded.Value().Get<ByteString>();
+    if (value == nullptr) {
+        return;
+    }
+    if (value->bytes.size() > cv::uaopc::kMaxAutomationBytes) {
+        Check(mapped.VarType() == cv::VT_BSTR);
+        return;
+    }
+    Check(mapped.AsBytes().size() == value->bytes.size());
+    Check(cv::uaopc::FromAutomation(mapped) == decoded.Value());
+}
+
 template <class... Responses>
 void DecodeResponses(std::string_view body) {
     (DecodeResponse<Responses>(body, "fuzz", Limits()), ...);
@@ -127,6 +147,7 @@ extern "C" int LLVMFuzzerTestOneInput(const uint8_t* data, size_t size) {
             break;
         case 1:
             RoundTrip<Variant>(bytes);
+            Map(bytes);
             break;
         case 2:
             RoundTrip<DataValue>(bytes);
