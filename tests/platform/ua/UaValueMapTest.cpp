@@ -4,6 +4,7 @@
 
 #include <cstdlib>
 #include <ctime>
+#include <limits>
 #include <string>
 
 #include "platform/OleDate.h"
@@ -155,6 +156,10 @@ TEST_F(UaValueMap, TimesGoToLocalDatesAndBackToTheMillisecond) {
         EXPECT_EQ(UaDateTimeOf(OleDateOf(time)), time) << time.ticks;
     }
     EXPECT_FALSE(UaDateTimeOf(kOleDateMin - 2));
+    for (const int64_t ticks :
+         {std::numeric_limits<int64_t>::min(), std::numeric_limits<int64_t>::max()}) {
+        EXPECT_EQ(OleDateOf({ticks}), 0.0) << ticks;
+    }
 }
 
 TEST_F(UaValueMap, ATimeStampIsTheSourcesElseTheServers) {
