@@ -2,7 +2,10 @@
 // the path, the rest is a received byte stream (cut into frames, joined into
 // messages, decoded as every response the client knows) or one encoded
 // value. Checks that what decodes encodes to a form that decodes to the
-// same encoding again, and that the reasons a server sends come out plain.
+// same encoding again, that the reasons a server sends come out plain, that
+// the memory a decoded value was charged is the least it decodes with, and
+// that a decoded value survives the mapping to the automation interface (a
+// ByteString as one buffer that maps back).
 
 #include <algorithm>
 #include <cstdint>
@@ -10,6 +13,7 @@
 #include <string>
 #include <string_view>
 
+#include "platform/ua/UaValueMap.h"
 #include "ua/encoding/Decoder.h"
 #include "ua/encoding/Encoder.h"
 #include "ua/secure/ChunkAssembler.h"
@@ -37,7 +41,7 @@ DecodeLimits Limits() {
     DecodeLimits limits;
     limits.maxStringLength = 1u << 16;
     limits.maxArrayLength = 1u << 16;
-    limits.maxAllocation = 64u << 20;
+    limits.maxAllocation = 1u << 20;
     return limits;
 }
 
@@ -50,6 +54,23 @@ void CheckPlain(std::string_view text) {
                        [](char c) { return static_cast<unsigned char>(c) < 0x20 || c == 0x7F; }));
 }
 
+// One byte less than a value was charged refuses it.
+template <class T>
+void CheckCharge(std::string_view bytes) {
+    Decoder decoder(bytes, Limits());
+    T value{};
+    decoder(value);
+    if (!decoder.Ok() || decoder.Allocated() == 0) {
+        return;
+    }
+    DecodeLimits tighter = Limits();
+    tighter.maxAllocation = decoder.Allocated() - 1;
+    Decoder refused(bytes, tighter);
+    T again{};
+    refused(again);
+    Check(refused.Failure().status == status::BadEncodingLimitsExceeded);
+}
+
 template <class T>
 void RoundTrip(std::string_view bytes) {
     auto decoded = Decode<T>(bytes, Limits());
@@ -60,6 +81,25 @@ void RoundTrip(std::string_view bytes) {
     auto again = Decode<T>(encoded, Limits());
     Check(again.Ok());
     Check(Encode(again.Value()) == encoded);
+    CheckCharge<T>(bytes);
+}
+
+void Map(std::string_view bytes) {
+    auto decoded = Decode<Variant>(bytes, Limits());
+    if (!decoded) {
+        return;
+    }
+    const cv::Variant mapped = cv::uaopc::ToAutomation(decoded.Value());
+    const ByteString* value = decoded.Value().Get<ByteString>();
+    if (value == nullptr) {
+        return;
+    }
+    if (value->bytes.size() > cv::uaopc::kMaxAutomationBytes) {
+        Check(mapped.VarType() == cv::VT_BSTR);
+        return;
+    }
+    Check(mapped.AsBytes().size() == value->bytes.size());
+    Check(cv::uaopc::FromAutomation(mapped) == decoded.Value());
 }
 
 template <class... Responses>
@@ -70,7 +110,8 @@ void DecodeResponses(std::string_view body) {
 void Stream(std::string_view bytes) {
     NoneSecurityPolicy policy;
     ChunkAssembler assembler(policy);
-    assembler.SetLimits(1u << 20, 64);
+    // Small enough for a fuzzed stream to reach every limit.
+    assembler.SetLimits(1u << 14, 64, 1u << 15);
     assembler.AcceptToken(1);
     FrameReader reader(1u << 16);
     reader.Append(bytes);
@@ -125,6 +166,7 @@ extern "C" int LLVMFuzzerTestOneInput(const uint8_t* data, size_t size) {
             break;
         case 1:
             RoundTrip<Variant>(bytes);
+            Map(bytes);
             break;
         case 2:
             RoundTrip<DataValue>(bytes);

@@ -33,8 +33,8 @@ void Channel::OpcSetRawValue(const Variant& vValue, int32_t lQuality, double dTi
     mdTimeStamp = dTimeStamp;
     if (vValue.IsArray()) {
         std::string sLines;
-        for (const Variant& vElement : vValue.Elements()) {
-            sLines += VariantText(vElement) + kCrLf;
+        for (size_t i = 0; i < vValue.ElementCount(); ++i) {
+            sLines += VariantText(vValue.Element(i)) + kCrLf;
         }
         mvRawValue = Variant::Str(sLines);
     }

@@ -48,6 +48,11 @@ Variant Variant::Array(uint16_t elementType, std::vector<Variant> elements, int3
     return Variant(vt, ArrayData{std::move(elements), lowerBound});
 }
 
+Variant Variant::Bytes(std::vector<uint8_t> bytes, int32_t lowerBound) {
+    return Variant(static_cast<uint16_t>(VT_ARRAY | VT_UI1),
+                   ByteData{std::move(bytes), lowerBound});
+}
+
 int16_t Variant::AsI2() const {
     return ValueOr(std::get_if<int16_t>(&value_), int16_t{0});
 }
@@ -80,9 +85,29 @@ const std::vector<Variant>& Variant::Elements() const {
     return array != nullptr ? array->elements : kNone;
 }
 
+const std::vector<uint8_t>& Variant::AsBytes() const {
+    static const std::vector<uint8_t> kNone;
+    const auto* bytes = std::get_if<ByteData>(&value_);
+    return bytes != nullptr ? bytes->bytes : kNone;
+}
+
 int32_t Variant::LowerBound() const {
+    if (const auto* bytes = std::get_if<ByteData>(&value_)) {
+        return bytes->lowerBound;
+    }
     const auto* array = std::get_if<ArrayData>(&value_);
     return array != nullptr ? array->lowerBound : 0;
+}
+
+size_t Variant::ElementCount() const {
+    return Elements().size() + AsBytes().size();
+}
+
+Variant Variant::Element(size_t index) const {
+    if (index < AsBytes().size()) {
+        return I2(AsBytes()[index]);
+    }
+    return index < Elements().size() ? Elements()[index] : Variant();
 }
 
 std::optional<double> NumberOf(const Variant& value) {

@@ -26,12 +26,14 @@ enum VarType : uint16_t {
     VT_BSTR = 8,
     VT_BOOL = 11,
     VT_VARIANT = 12,
+    VT_UI1 = 17,
     VT_ARRAY = 0x2000,
 };
 
 // A value as the automation library carries it: empty, null, 16- and 32-bit
 // integers, single and double floats, Boolean, date (OLE automation date:
-// days since 1899-12-30), text, and one-dimensional arrays of these.
+// days since 1899-12-30), text, one-dimensional arrays of these, and byte
+// arrays (VT_ARRAY | VT_UI1), which keep their bytes in one buffer.
 class Variant {
   public:
     Variant() = default;  // empty
@@ -47,6 +49,7 @@ class Variant {
     // elementType is the type of every element (VT_VARIANT for mixed ones).
     static Variant Array(uint16_t elementType, std::vector<Variant> elements,
                          int32_t lowerBound = 0);
+    static Variant Bytes(std::vector<uint8_t> bytes, int32_t lowerBound = 0);
 
     // The type code; arrays answer VT_ARRAY | element type.
     uint16_t VarType() const { return vt_; }
@@ -63,8 +66,14 @@ class Variant {
     double AsR8() const;  // VT_R8 and VT_DATE
     bool AsBool() const;
     const std::string& AsStr() const;
+    // The elements of an array made by Array; a byte array's are in AsBytes.
     const std::vector<Variant>& Elements() const;
+    const std::vector<uint8_t>& AsBytes() const;
     int32_t LowerBound() const;
+    // Any array's elements one by one, a byte array's as I2 (the scalar
+    // nearest a byte); 0 and empty for a scalar or an index past the end.
+    size_t ElementCount() const;
+    Variant Element(size_t index) const;
 
     bool operator==(const Variant& other) const = default;
 
@@ -74,8 +83,13 @@ class Variant {
         int32_t lowerBound = 0;
         bool operator==(const ArrayData&) const = default;
     };
-    using Storage =
-        std::variant<std::monostate, int16_t, int32_t, float, double, bool, std::string, ArrayData>;
+    struct ByteData {
+        std::vector<uint8_t> bytes;
+        int32_t lowerBound = 0;
+        bool operator==(const ByteData&) const = default;
+    };
+    using Storage = std::variant<std::monostate, int16_t, int32_t, float, double, bool, std::string,
+                                 ArrayData, ByteData>;
 
     Variant(uint16_t vt, Storage value) : vt_(vt), value_(std::move(value)) {}
 

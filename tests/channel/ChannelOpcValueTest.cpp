@@ -37,6 +37,8 @@ TEST_F(OpcChannel, ArraysBecomeLinesAndTextsStopAtNul) {
     EXPECT_EQ(channel.RawValue(), Variant::Str("1\r\n2.5\r\n-3\r\n"));
     EXPECT_EQ(channel.OpcRawValueVarType(), VT_BSTR);
     EXPECT_EQ(channel.OpcTimeStamp(), 4.5);
+    channel.OpcSetRawValue(Variant::Bytes({0, 7, 255}), kGood, 0, false);
+    EXPECT_EQ(channel.RawValue(), Variant::Str("0\r\n7\r\n255\r\n"));
     channel.OpcSetRawValue(Variant::Str(std::string("ab\0cd", 5)), kGood, 0, false);
     EXPECT_EQ(channel.RawValue(), Variant::Str("ab"));
 }

@@ -125,14 +125,16 @@ TEST(ChangeType, WritesAndReadsDatesWithTheRegionalFormats) {
 }
 
 TEST(ChangeType, ConvertsArraysOnlyToTheirOwnTypeAndValuesInPlace) {
-    const Variant array = Variant::Array(VT_I2, {Variant::I2(1), Variant::I2(2)}, 1);
-    EXPECT_EQ(array.VarType(), VT_ARRAY | VT_I2);
-    EXPECT_EQ(To(array, VT_ARRAY | VT_I2), array);
-    EXPECT_EQ(Fails(array, VT_ARRAY | VT_R8), kErrTypeMismatch);
-    EXPECT_EQ(Fails(array, VT_I2), kErrTypeMismatch);
-    EXPECT_EQ(Fails(array, VT_BSTR), kErrTypeMismatch);
-    EXPECT_EQ(Fails(Variant::I2(1), VT_ARRAY | VT_I2), kErrTypeMismatch);
-    EXPECT_EQ(TextOf(array, kPoint), "");
+    for (const Variant& array :
+         {Variant::Array(VT_I2, {Variant::I2(1), Variant::I2(2)}, 1), Variant::Bytes({1, 2}, 1)}) {
+        const auto vt = array.VarType();
+        EXPECT_EQ(To(array, vt), array);
+        EXPECT_EQ(Fails(array, VT_ARRAY | VT_R8), kErrTypeMismatch);
+        EXPECT_EQ(Fails(array, VT_I2), kErrTypeMismatch);
+        EXPECT_EQ(Fails(array, VT_BSTR), kErrTypeMismatch);
+        EXPECT_EQ(Fails(Variant::I2(1), vt), kErrTypeMismatch);
+        EXPECT_EQ(TextOf(array, kPoint), "");
+    }
     EXPECT_NE(Variant::Date(2.5), Variant::R8(2.5)) << "values of two types never compare equal";
 
     Variant value = Variant::Str("12.5");
@@ -142,6 +144,29 @@ TEST(ChangeType, ConvertsArraysOnlyToTheirOwnTypeAndValuesInPlace) {
     EXPECT_EQ(ChangeType(value, value, VT_R8, kPoint),
               (ErrorInfo{kErrTypeMismatch, "Type mismatch"}));
     EXPECT_TRUE(value.IsEmpty());
+}
+
+// Both kinds of array answer the same questions; a byte array keeps one
+// buffer and hands its bytes out as I2 elements.
+TEST(VariantArrays, BytesAndVariantsShowTheSameElements) {
+    const Variant elements = Variant::Array(VT_I2, {Variant::I2(0), Variant::I2(255)}, 1);
+    const Variant bytes = Variant::Bytes({0, 255}, 1);
+    EXPECT_EQ(elements.VarType(), VT_ARRAY | VT_I2);
+    EXPECT_EQ(bytes.VarType(), VT_ARRAY | VT_UI1);
+    EXPECT_TRUE(bytes.IsArray());
+    EXPECT_EQ(bytes.AsBytes(), (std::vector<uint8_t>{0, 255}));
+    EXPECT_TRUE(bytes.Elements().empty());
+    EXPECT_TRUE(elements.AsBytes().empty());
+    for (const Variant& array : {elements, bytes}) {
+        EXPECT_EQ(array.LowerBound(), 1);
+        ASSERT_EQ(array.ElementCount(), 2u);
+        EXPECT_EQ(array.Element(0), Variant::I2(0));
+        EXPECT_EQ(array.Element(1), Variant::I2(255));
+        EXPECT_EQ(array.Element(2), Variant());
+    }
+    EXPECT_NE(bytes, elements);
+    EXPECT_NE(bytes, Variant::Bytes({0, 254}, 1));
+    EXPECT_EQ(Variant::I2(3).ElementCount(), 0u);
 }
 
 }  // namespace

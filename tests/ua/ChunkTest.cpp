@@ -114,6 +114,70 @@ TEST_F(Chunks, AcceptsTheTokenInForceAndTheOneBefore) {
     }
 }
 
+struct Piece {
+    uint32_t requestId;
+    char chunkType;
+    size_t size;
+};
+
+struct Assembly {
+    const char* name;
+    std::vector<Piece> pieces;
+    // The status of the last piece; all before it are taken.
+    StatusCode last;
+    const char* text;
+};
+
+// Messages up to 20000 bytes, all unfinished ones up to 30000 together.
+TEST_F(Chunks, UnfinishedMessagesHoldNoMoreThanTheirCapTogether) {
+    const std::vector<Assembly> cases = {
+        {"four interleaved up to the cap, a finished one frees its room",
+         {{1, 'C', 7000},
+          {2, 'C', 7000},
+          {3, 'C', 7000},
+          {4, 'C', 9000},
+          {1, 'F', 0},
+          {2, 'C', 7000}},
+         status::Good,
+         ""},
+        {"four interleaved over the cap",
+         {{1, 'C', 7000}, {2, 'C', 7000}, {3, 'C', 7000}, {4, 'C', 7000}, {1, 'C', 2001}},
+         status::BadTcpMessageTooLarge,
+         "4 messages unfinished that together hold more than 30000"},
+        {"an aborted message frees its room",
+         {{1, 'C', 15000}, {2, 'C', 14000}, {1, 'A', 0}, {3, 'C', 16000}},
+         status::Good,
+         ""},
+        {"one message over its limit",
+         {{1, 'C', 15000}, {1, 'C', 5001}},
+         status::BadTcpMessageTooLarge,
+         "larger than 20000 bytes"},
+    };
+    for (const Assembly& assembly : cases) {
+        SCOPED_TRACE(assembly.name);
+        ChunkAssembler assembler(policy_);
+        assembler.SetLimits(20'000, 0, 30'000);
+        assembler.AcceptToken(3);
+        uint32_t sequence = 1;
+        Result<ChunkAssembler::Outcome> outcome = ChunkAssembler::Outcome{};
+        for (const Piece& piece : assembly.pieces) {
+            ASSERT_TRUE(outcome) << outcome.Failure().text;
+            std::string chunk = MakeFrame(MessageKind::Message, ChunkType::Final, "");
+            Encoder encoder(chunk);
+            for (const uint32_t field : {7u, 3u, sequence++, piece.requestId}) {
+                encoder(field);
+            }
+            chunk += std::string(piece.size, 'x');
+            chunk[3] = piece.chunkType;
+            encoder.PatchUInt32(4, static_cast<uint32_t>(chunk.size()));
+            outcome = assembler.Add(AsFrame(chunk));
+        }
+        EXPECT_EQ(outcome ? status::Good : outcome.Failure().status, assembly.last);
+        EXPECT_NE((outcome ? std::string() : outcome.Failure().text).find(assembly.text),
+                  std::string::npos);
+    }
+}
+
 TEST_F(Chunks, FrameReaderCutsAStreamThatArrivesByteByByte) {
     const std::string first = MakeFrame(MessageKind::Acknowledge, ChunkType::Final, "abcd");
     const std::string second = MakeFrame(MessageKind::Message, ChunkType::Intermediate, "");

@@ -131,6 +131,17 @@ TEST(ScriptedServerFaults, EachBrokenAnswerEndsTheReadWithAClearError) {
         {"unknown chunk type",
          [](ScriptedServer& s, const Request&) { s.SendRaw(Header("MSGQ", 8)); },
          status::BadTcpMessageTypeInvalid, "unknown chunk type \"Q\"", true},
+        {"unfinished messages over their cap",
+         [](ScriptedServer& s, const Request& r) {
+             // Four answers of 4.2 MB, none finished: each within the message
+             // limit, together over the cap.
+             const std::string part(60'000, 'x');
+             for (uint32_t i = 0; i < 4 * 70; ++i) {
+                 s.SendChunk(MessageKind::Message, 'C', r.requestId + i % 4, part);
+             }
+         },
+         status::BadTcpMessageTooLarge,
+         "4 messages unfinished that together hold more than 16777216 bytes", true},
         {"ERR message",
          [](ScriptedServer& s, const Request&) {
              s.SendRaw(MakeFrame(MessageKind::Error, ChunkType::Final,

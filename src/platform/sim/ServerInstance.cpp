@@ -1,6 +1,5 @@
 #include "platform/sim/ServerInstance.h"
 
-#include <algorithm>
 #include <cmath>
 
 #include "platform/opc/OpcResult.h"
@@ -28,9 +27,15 @@ bool SameValue(const Variant& a, const Variant& b) {
         return true;
     }
     if (a.IsArray()) {
-        return a.LowerBound() == b.LowerBound() &&
-               std::equal(a.Elements().begin(), a.Elements().end(), b.Elements().begin(),
-                          b.Elements().end(), SameValue);
+        if (a.LowerBound() != b.LowerBound() || a.ElementCount() != b.ElementCount()) {
+            return false;
+        }
+        for (size_t i = 0; i < a.ElementCount(); ++i) {
+            if (!SameValue(a.Element(i), b.Element(i))) {
+                return false;
+            }
+        }
+        return true;
     }
     return a == b;
 }
@@ -43,9 +48,9 @@ int32_t ConvertForWrite(const Variant& value, uint16_t type, Variant& converted)
     }
     if (value.IsArray()) {
         const auto element = static_cast<uint16_t>(type & ~VT_ARRAY);
-        std::vector<Variant> elements(value.Elements().size());
+        std::vector<Variant> elements(value.ElementCount());
         for (size_t i = 0; i < elements.size(); ++i) {
-            if (const int32_t code = ConvertForWrite(value.Elements()[i], element, elements[i])) {
+            if (const int32_t code = ConvertForWrite(value.Element(i), element, elements[i])) {
                 return code;
             }
         }

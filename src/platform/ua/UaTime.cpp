@@ -11,6 +11,9 @@ namespace cv::uaopc {
 namespace {
 
 constexpr int64_t kTicksPerSecond = 10'000'000;
+// Ticks about 14600 years from 1601, far beyond the years 100 to 9999 the
+// interface's dates cover.
+constexpr int64_t kFarTicks = int64_t{1} << 62;
 
 // Seconds and milliseconds since the Unix epoch, rounded down.
 void Split(int64_t unixMs, time_t& seconds, int64_t& millis) {
@@ -21,6 +24,9 @@ void Split(int64_t unixMs, time_t& seconds, int64_t& millis) {
 }  // namespace
 
 double OleDateOf(ua::DateTime time) {
+    if (time.ticks < -kFarTicks || time.ticks > kFarTicks) {
+        return 0.0;
+    }
     const int64_t unixTicks = time.ticks - ua::DateTime::kUnixEpochTicks;
     const int64_t unixMs = unixTicks >= 0
                                ? unixTicks / ua::DateTime::kTicksPerMillisecond

@@ -1,5 +1,8 @@
 #include "platform/ua/UaValueMap.h"
 
+#include <string>
+#include <vector>
+
 #include "platform/ua/UaTime.h"
 #include "ua/types/NodeIdText.h"
 #include "ua/types/PlainText.h"
@@ -11,12 +14,13 @@ namespace {
 using ua::BuiltinType;
 
 Variant Bytes(const ua::ByteString& bytes) {
-    std::vector<Variant> elements;
-    elements.reserve(bytes.bytes.size());
-    for (const char byte : bytes.bytes) {
-        elements.push_back(Variant::I2(static_cast<int16_t>(static_cast<uint8_t>(byte))));
+    const std::string& data = bytes.bytes;
+    if (data.size() > kMaxAutomationBytes) {
+        return Variant::Str("ByteString of " + std::to_string(data.size()) +
+                            " bytes, too long to show (the limit is " +
+                            std::to_string(kMaxAutomationBytes) + " bytes)");
     }
-    return Variant::Array(VT_I2, std::move(elements));
+    return Variant::Bytes(std::vector<uint8_t>(data.begin(), data.end()));
 }
 
 std::string Text(const ua::QualifiedName& name) {
@@ -114,7 +118,7 @@ uint16_t AutomationTypeOf(BuiltinType type) {
         case BuiltinType::LocalizedText:
             return VT_BSTR;
         case BuiltinType::ByteString:
-            return VT_ARRAY | VT_I2;
+            return VT_ARRAY | VT_UI1;
         case BuiltinType::Variant:
             return VT_VARIANT;
         default:
@@ -127,8 +131,8 @@ Variant ToAutomation(const ua::Variant& value) {
         return Scalar(value);
     }
     const uint16_t scalarType = AutomationTypeOf(value.Type());
-    // Arrays of arrays (byte strings), of mixed values and of values the
-    // interface cannot carry hold Variants.
+    // Arrays of byte arrays, of mixed values and of values the interface
+    // cannot carry hold Variants.
     const bool variants = (scalarType & VT_ARRAY) != 0 || scalarType == VT_EMPTY;
     const uint16_t elementType = variants ? static_cast<uint16_t>(VT_VARIANT) : scalarType;
     std::vector<Variant> elements;
@@ -140,6 +144,10 @@ Variant ToAutomation(const ua::Variant& value) {
 }
 
 ua::Variant FromAutomation(const Variant& value) {
+    if (value.VarType() == (VT_ARRAY | VT_UI1)) {
+        const std::vector<uint8_t>& bytes = value.AsBytes();
+        return ua::Variant(ua::ByteString{std::string(bytes.begin(), bytes.end())});
+    }
     if (value.IsArray()) {
         ua::Variant::Elements elements;
         elements.reserve(value.Elements().size());

@@ -3,6 +3,14 @@
 #include <limits>
 
 namespace cv::ua {
+namespace {
+
+// What the allocator keeps beside each block it hands out.
+constexpr uint64_t kBlockOverhead = 16;
+// The counts a shared value's block holds beside the value.
+constexpr uint64_t kSharedOverhead = 16;
+
+}  // namespace
 
 Error Decoder::Failure() const {
     if (Ok()) {
@@ -52,12 +60,29 @@ uint32_t Decoder::ArrayLength(size_t elementSize) {
         Fail("an array of " + std::to_string(count) + " elements is longer than the data");
         return 0;
     }
-    allocated_ += uint64_t{count} * elementSize;
-    if (allocated_ > limits_.maxAllocation) {
-        Fail("the arrays of the message need more memory than allowed", true);
+    if (!Charge(uint64_t{count} * elementSize + kBlockOverhead)) {
         return 0;
     }
     return count;
+}
+
+bool Decoder::Charge(uint64_t bytes) {
+    if (bytes > limits_.maxAllocation - allocated_) {
+        Fail("the message needs more memory than the " + std::to_string(limits_.maxAllocation) +
+                 " bytes allowed",
+             true);
+        return false;
+    }
+    allocated_ += bytes;
+    return true;
+}
+
+template <class T>
+std::shared_ptr<T> Decoder::MakeNested() {
+    if (!Charge(sizeof(T) + kSharedOverhead + kBlockOverhead)) {
+        return nullptr;
+    }
+    return std::make_shared<T>();
 }
 
 void Decoder::operator()(std::string& v) {
@@ -77,7 +102,14 @@ void Decoder::operator()(std::string& v) {
              true);
         return;
     }
-    v = Bytes(static_cast<size_t>(length));
+    if (Remaining() < static_cast<size_t>(length)) {
+        Fail("the data ends early");
+        return;
+    }
+    // The text and its terminating zero.
+    if (Charge(static_cast<uint64_t>(length) + 1 + kBlockOverhead)) {
+        v = Bytes(static_cast<size_t>(length));
+    }
 }
 
 void Decoder::operator()(Guid& v) {
@@ -219,9 +251,10 @@ void Decoder::operator()(DiagnosticInfo& v) {
         (*this)(v.innerStatusCode.emplace());
     }
     if (mask & 0x40) {
-        auto inner = std::make_shared<DiagnosticInfo>();
-        (*this)(*inner);
-        v.inner = std::move(inner);
+        if (auto inner = MakeNested<DiagnosticInfo>()) {
+            (*this)(*inner);
+            v.inner = std::move(inner);
+        }
     }
     Leave();
 }
@@ -280,22 +313,22 @@ void Decoder::VariantScalar(BuiltinType type, Variant& v) {
             return read(std::type_identity<LocalizedText>());
         case BuiltinType::ExtensionObject:
             return read(std::type_identity<ExtensionObject>());
-        case BuiltinType::DataValue: {
-            auto value = std::make_shared<DataValue>();
-            (*this)(*value);
-            v = Variant(std::shared_ptr<const DataValue>(std::move(value)));
+        case BuiltinType::DataValue:
+            if (auto value = MakeNested<DataValue>()) {
+                (*this)(*value);
+                v = Variant(std::shared_ptr<const DataValue>(std::move(value)));
+            }
             return;
-        }
         case BuiltinType::Variant:
             v = Variant();
             Fail("a variant holds a variant outside an array");
             return;
-        case BuiltinType::DiagnosticInfo: {
-            auto info = std::make_shared<DiagnosticInfo>();
-            (*this)(*info);
-            v = Variant(std::shared_ptr<const DiagnosticInfo>(std::move(info)));
+        case BuiltinType::DiagnosticInfo:
+            if (auto info = MakeNested<DiagnosticInfo>()) {
+                (*this)(*info);
+                v = Variant(std::shared_ptr<const DiagnosticInfo>(std::move(info)));
+            }
             return;
-        }
     }
 }
 

@@ -2,6 +2,7 @@
 
 #include <cstdint>
 #include <cstring>
+#include <memory>
 #include <string>
 #include <string_view>
 #include <type_traits>
@@ -31,6 +32,9 @@ class Decoder {
     Error Failure() const;
     size_t Position() const { return static_cast<size_t>(pos_ - begin_); }
     size_t Remaining() const { return static_cast<size_t>(end_ - pos_); }
+    // The memory the values decoded so far take, as charged against the
+    // limit; a charge that did not fit is not in it.
+    uint64_t Allocated() const { return allocated_; }
     // Records a fault found by a caller (the first one counts).
     void Fail(std::string_view sWhat, bool bLimit = false);
 
@@ -113,7 +117,8 @@ class Decoder {
     }
     // The next size bytes, or an empty view after a fault.
     std::string_view Bytes(size_t size);
-    // An array's element count, checked against the limits; 0 for null.
+    // An array's element count, checked against the limits, its storage
+    // charged; 0 for null.
     uint32_t ArrayLength(size_t elementSize);
 
   private:
@@ -128,8 +133,15 @@ class Decoder {
         std::memcpy(&v, pos_, sizeof v);
         pos_ += sizeof v;
     }
+    // Charges a block of memory about to be allocated; false (and a fault)
+    // when the message would take more than allowed.
+    bool Charge(uint64_t bytes);
     void NodeIdBody(uint8_t encoding, NodeId& v);
     void VariantScalar(BuiltinType type, Variant& v);
+    // A value of its own block (a data value or diagnostics in a variant,
+    // inner diagnostics), charged before it is made; null after a fault.
+    template <class T>
+    std::shared_ptr<T> MakeNested();
     bool Enter();
     void Leave() { --depth_; }
 

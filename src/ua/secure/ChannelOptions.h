@@ -14,6 +14,9 @@ struct TransportLimits {
     uint32_t maxMessageSize = 16u << 20;
     // 0 for no limit.
     uint32_t maxChunkCount = 0;
+    // What the messages still waiting for chunks may hold together, however
+    // many the server interleaves; 0 for no limit.
+    uint32_t maxUnfinishedSize = 16u << 20;
 };
 
 struct ChannelOptions {

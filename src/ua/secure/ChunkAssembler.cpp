@@ -17,9 +17,11 @@ Error TooLarge(const std::string& what) {
 
 }  // namespace
 
-void ChunkAssembler::SetLimits(uint32_t maxMessageSize, uint32_t maxChunkCount) {
+void ChunkAssembler::SetLimits(uint32_t maxMessageSize, uint32_t maxChunkCount,
+                               uint32_t maxUnfinishedSize) {
     maxMessageSize_ = maxMessageSize;
     maxChunkCount_ = maxChunkCount;
+    maxUnfinishedSize_ = maxUnfinishedSize;
 }
 
 void ChunkAssembler::AcceptToken(uint32_t tokenId) {
@@ -106,8 +108,11 @@ Result<ChunkAssembler::Outcome> ChunkAssembler::Add(Frame frame) {
 Result<ChunkAssembler::Outcome> ChunkAssembler::Collect(const FrameHeader& header,
                                                         uint32_t requestId, std::string_view body) {
     Outcome outcome;
+    auto found = partials_.find(requestId);
     if (header.chunkType == ChunkType::Abort) {
-        partials_.erase(requestId);
+        if (found != partials_.end()) {
+            Take(found);
+        }
         ErrorMessage abort;
         Decoder decoder(body);
         decoder(abort);
@@ -117,7 +122,6 @@ Result<ChunkAssembler::Outcome> ChunkAssembler::Collect(const FrameHeader& heade
                                  (abort.reason.empty() ? "no reason given" : abort.reason) + "."}};
         return outcome;
     }
-    auto found = partials_.find(requestId);
     if (found == partials_.end()) {
         if (partials_.size() >= kMaxUnfinishedMessages) {
             return Error{status::BadTcpInternalError,
@@ -126,19 +130,41 @@ Result<ChunkAssembler::Outcome> ChunkAssembler::Collect(const FrameHeader& heade
         found = partials_.emplace(requestId, Partial{}).first;
     }
     Partial& partial = found->second;
+    auto room = CheckRoom(partial, body);
+    if (!room) {
+        return room.Failure();
+    }
     partial.body.append(body);
     ++partial.chunks;
-    if (maxChunkCount_ != 0 && partial.chunks > maxChunkCount_) {
-        return TooLarge("in more than " + std::to_string(maxChunkCount_) + " chunks");
-    }
-    if (maxMessageSize_ != 0 && partial.body.size() > maxMessageSize_) {
-        return TooLarge("larger than " + std::to_string(maxMessageSize_) + " bytes");
-    }
+    unfinishedSize_ += body.size();
     if (header.chunkType == ChunkType::Final) {
-        outcome.message = SecureMessage{header.kind, requestId, std::move(partial.body)};
-        partials_.erase(found);
+        outcome.message = SecureMessage{header.kind, requestId, Take(found)};
     }
     return outcome;
+}
+
+// Checked before the chunk is added, so no limit is passed even briefly.
+Result<Done> ChunkAssembler::CheckRoom(const Partial& partial, std::string_view body) const {
+    if (maxChunkCount_ != 0 && partial.chunks >= maxChunkCount_) {
+        return TooLarge("in more than " + std::to_string(maxChunkCount_) + " chunks");
+    }
+    if (maxMessageSize_ != 0 && partial.body.size() + body.size() > maxMessageSize_) {
+        return TooLarge("larger than " + std::to_string(maxMessageSize_) + " bytes");
+    }
+    if (maxUnfinishedSize_ != 0 && unfinishedSize_ + body.size() > maxUnfinishedSize_) {
+        return Error{status::BadTcpMessageTooLarge,
+                     "The server left " + std::to_string(partials_.size()) +
+                         " messages unfinished that together hold more than " +
+                         std::to_string(maxUnfinishedSize_) + " bytes."};
+    }
+    return Done{};
+}
+
+std::string ChunkAssembler::Take(std::map<uint32_t, Partial>::iterator partial) {
+    std::string body = std::move(partial->second.body);
+    unfinishedSize_ -= body.size();
+    partials_.erase(partial);
+    return body;
 }
 
 }  // namespace cv::ua

@@ -38,8 +38,9 @@ class ChunkAssembler {
 
     explicit ChunkAssembler(SecurityPolicy& policy) : policy_(policy) {}
 
-    // 0 for no limit.
-    void SetLimits(uint32_t maxMessageSize, uint32_t maxChunkCount);
+    // 0 for no limit. maxUnfinishedSize bounds what all messages still
+    // waiting for chunks hold together.
+    void SetLimits(uint32_t maxMessageSize, uint32_t maxChunkCount, uint32_t maxUnfinishedSize);
     // Chunks must carry this channel id once it is known.
     void SetChannelId(uint32_t channelId) { channelId_ = channelId; }
     // The tokens whose MSG and CLO chunks are accepted: the one in force and
@@ -57,10 +58,16 @@ class ChunkAssembler {
 
     Result<Done> CheckSequence(uint32_t sequenceNumber);
     Result<Outcome> Collect(const FrameHeader& header, uint32_t requestId, std::string_view body);
+    Result<Done> CheckRoom(const Partial& partial, std::string_view body) const;
+    // Removes an unfinished message and gives its body.
+    std::string Take(std::map<uint32_t, Partial>::iterator partial);
 
     SecurityPolicy& policy_;
     uint32_t maxMessageSize_ = 0;
     uint32_t maxChunkCount_ = 0;
+    uint32_t maxUnfinishedSize_ = 0;
+    // The bytes all unfinished messages hold.
+    uint64_t unfinishedSize_ = 0;
     uint32_t channelId_ = 0;
     std::vector<uint32_t> tokens_;
     std::optional<uint32_t> lastSequence_;

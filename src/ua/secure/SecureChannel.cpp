@@ -212,7 +212,8 @@ void SecureChannel::OnAcknowledge(const Frame& frame) {
     }
     writer_.SetLimits({std::min(options_.limits.sendBufferSize, limits.receiveBufferSize),
                        limits.maxMessageSize, limits.maxChunkCount});
-    assembler_.SetLimits(options_.limits.maxMessageSize, options_.limits.maxChunkCount);
+    assembler_.SetLimits(options_.limits.maxMessageSize, options_.limits.maxChunkCount,
+                         options_.limits.maxUnfinishedSize);
     state_ = State::AwaitOpen;
     SendOpen(false);
 }

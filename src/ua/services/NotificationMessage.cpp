@@ -1,3 +1,5 @@
+#include <algorithm>
+
 #include "ua/encoding/Decoder.h"
 #include "ua/encoding/Encoder.h"
 #include "ua/services/SubscriptionServices.h"
@@ -26,7 +28,11 @@ void NotificationMessage::Visit(NotificationMessage& s, Decoder& v) {
     s.dataChanges.clear();
     s.statusChanges.clear();
     s.otherNotifications.clear();
-    const uint32_t count = v.ArrayLength(sizeof(DataChangeNotification));
+    // Each notification lands in one of three lists, which grow as they fill.
+    constexpr size_t kLargest =
+        std::max({sizeof(DataChangeNotification), sizeof(StatusChangeNotification),
+                  sizeof(ExtensionObject)});
+    const uint32_t count = v.ArrayLength(2 * kLargest);
     for (uint32_t i = 0; i < count && v.Ok(); ++i) {
         ExtensionObject object;
         v(object.typeId);

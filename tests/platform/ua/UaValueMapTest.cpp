@@ -4,6 +4,7 @@
 
 #include <cstdlib>
 #include <ctime>
+#include <limits>
 #include <string>
 
 #include "platform/OleDate.h"
@@ -68,8 +69,7 @@ TEST_F(UaValueMap, EachBuiltInTypeBecomesTheNearestAutomationType) {
         {ua::Variant(kSummer), Variant::Date(Local(2024, 7, 1, 14, 250))},
         {ua::Variant(*ua::Guid::FromText("72962B91-FA75-4AE6-8D28-B404DC7DAF63")),
          Variant::Str("72962B91-FA75-4AE6-8D28-B404DC7DAF63")},
-        {ua::Variant(ua::ByteString{"\xDE\xAD"}),
-         Variant::Array(VT_I2, {Variant::I2(0xDE), Variant::I2(0xAD)})},
+        {ua::Variant(ua::ByteString{"\xDE\xAD"}), Variant::Bytes({0xDE, 0xAD})},
         {ua::Variant(ua::XmlElement{"<a/>"}), Variant::Str("<a/>")},
         {ua::Variant(ua::NodeId(1, std::string("Plant.FIC101"))),
          Variant::Str("ns=1;s=Plant.FIC101")},
@@ -96,7 +96,7 @@ TEST_F(UaValueMap, ArraysKeepTheirElementsFlattenedWithVariantsForMixedOrNestedO
         {Array(BuiltinType::Variant, {int16_t{5}, "five"}),
          Variant::Array(VT_VARIANT, {Variant::I2(5), Variant::Str("five")})},
         {Array(BuiltinType::ByteString, {ua::ByteString{"\x01"}}),
-         Variant::Array(VT_VARIANT, {Variant::Array(VT_I2, {Variant::I2(1)})})},
+         Variant::Array(VT_VARIANT, {Variant::Bytes({1})})},
         {Array(BuiltinType::ExtensionObject, {ua::ExtensionObject{}}),
          Variant::Array(VT_VARIANT, {Variant()})},
     };
@@ -120,10 +120,34 @@ TEST_F(UaValueMap, WrittenValuesTakeTheirOwnUaTypes) {
         {Variant::Array(VT_I2, {Variant::I2(1)}), Array(BuiltinType::Int16, {int16_t{1}})},
         {Variant::Array(VT_VARIANT, {Variant::I2(1), Variant::Str("x")}),
          Array(BuiltinType::Variant, {int16_t{1}, "x"})},
+        {Variant::Bytes({0xDE, 0, 0xAD}),
+         ua::Variant(ua::ByteString{std::string("\xDE\0\xAD", 3)})},
+        {Variant::Array(VT_VARIANT, {Variant::Bytes({})}),
+         Array(BuiltinType::Variant, {ua::ByteString{}})},
     };
     for (const auto& [value, expected] : cases) {
         EXPECT_EQ(FromAutomation(value), expected) << "automation type " << value.VarType();
     }
+}
+
+// A ByteString is one buffer up to the limit and a text saying how long it
+// is beyond; the buffer goes back as the same ByteString.
+TEST_F(UaValueMap, AByteStringIsOneBufferUpToItsLimit) {
+    std::string bytes(kMaxAutomationBytes, '\0');
+    for (size_t i = 0; i < bytes.size(); ++i) {
+        bytes[i] = static_cast<char>(i % 251);
+    }
+    const ua::Variant largest{ua::ByteString{bytes}};
+    const Variant mapped = ToAutomation(largest);
+    EXPECT_EQ(mapped.VarType(), VT_ARRAY | VT_UI1);
+    EXPECT_EQ(mapped.AsBytes(), std::vector<uint8_t>(bytes.begin(), bytes.end()));
+    EXPECT_EQ(FromAutomation(mapped), largest);
+    const ua::Variant tooLong{ua::ByteString{bytes + "x"}};
+    EXPECT_EQ(
+        ToAutomation(tooLong),
+        Variant::Str("ByteString of 65537 bytes, too long to show (the limit is 65536 bytes)"));
+    EXPECT_EQ(ToAutomation(Array(BuiltinType::ByteString, {tooLong})).Element(0),
+              ToAutomation(tooLong));
 }
 
 TEST_F(UaValueMap, TimesGoToLocalDatesAndBackToTheMillisecond) {
@@ -132,6 +156,10 @@ TEST_F(UaValueMap, TimesGoToLocalDatesAndBackToTheMillisecond) {
         EXPECT_EQ(UaDateTimeOf(OleDateOf(time)), time) << time.ticks;
     }
     EXPECT_FALSE(UaDateTimeOf(kOleDateMin - 2));
+    for (const int64_t ticks :
+         {std::numeric_limits<int64_t>::min(), std::numeric_limits<int64_t>::max()}) {
+        EXPECT_EQ(OleDateOf({ticks}), 0.0) << ticks;
+    }
 }
 
 // The time stamp is the server's, else the source's; the source's goes
