@@ -40,14 +40,7 @@ std::optional<int32_t> LocalUtcOffsetMinutes(double dOleDate) {
     if (!parts) {
         return std::nullopt;
     }
-    tm local{};
-    local.tm_year = parts->year - 1900;
-    local.tm_mon = parts->month - 1;
-    local.tm_mday = parts->day;
-    local.tm_hour = parts->hour;
-    local.tm_min = parts->minute;
-    local.tm_sec = parts->second;
-    local.tm_isdst = -1;
+    tm local = LocalCalendarTime(*parts);
     local.tm_wday = -1;  // set by a mktime that succeeds, whatever it answers
     (void)mktime(&local);
     if (local.tm_wday < 0) {

@@ -84,4 +84,16 @@ std::optional<double> OleDateFromParts(const OleDateParts& parts) {
     return OleDateFromTimePoint(time);
 }
 
+tm LocalCalendarTime(const OleDateParts& parts) {
+    tm local{};
+    local.tm_year = parts.year - 1900;
+    local.tm_mon = parts.month - 1;
+    local.tm_mday = parts.day;
+    local.tm_hour = parts.hour;
+    local.tm_min = parts.minute;
+    local.tm_sec = parts.second;
+    local.tm_isdst = -1;
+    return local;
+}
+
 }  // namespace cv

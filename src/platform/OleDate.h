@@ -1,5 +1,7 @@
 #pragma once
 
+#include <ctime>
+
 #include <chrono>
 #include <cstdint>
 #include <optional>
@@ -44,5 +46,7 @@ std::optional<OleDateParts> OleTimePointToParts(OleTimePoint time);
 // Nothing when a field is out of its range (month 13, 31 April, 24:00, a
 // year outside 100..9999).
 std::optional<double> OleDateFromParts(const OleDateParts& parts);
+// The parts as a local calendar time for mktime, daylight saving left to it.
+tm LocalCalendarTime(const OleDateParts& parts);
 
 }  // namespace cv

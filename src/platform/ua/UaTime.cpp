@@ -54,14 +54,7 @@ std::optional<ua::DateTime> UaDateTimeOf(double oleDate) {
     if (!parts) {
         return std::nullopt;
     }
-    tm local{};
-    local.tm_year = parts->year - 1900;
-    local.tm_mon = parts->month - 1;
-    local.tm_mday = parts->day;
-    local.tm_hour = parts->hour;
-    local.tm_min = parts->minute;
-    local.tm_sec = parts->second;
-    local.tm_isdst = -1;
+    tm local = LocalCalendarTime(*parts);
     const time_t seconds = mktime(&local);
     const int64_t ticks = static_cast<int64_t>(seconds) * kTicksPerSecond +
                           parts->millisecond * ua::DateTime::kTicksPerMillisecond;
